@@ -1,0 +1,53 @@
+#include "klv.h"
+
+namespace util {
+
+vector_streambuf::vector_streambuf() = default;
+
+vector_streambuf::vector_streambuf(const ByteVector& bytes) : vector_streambuf(bytes.data(), bytes.size()) {}
+
+vector_streambuf::vector_streambuf(const std::uint8_t* data, std::size_t size) {
+  // The get area is the vector itself: the stream reads in place and never
+  // writes through these pointers.
+  char* begin = const_cast<char*>(reinterpret_cast<const char*>(data));
+  setg(begin, begin, begin + size);
+}
+
+vector_streambuf::pos_type vector_streambuf::seekoff(off_type off, std::ios_base::seekdir dir,
+                                                     std::ios_base::openmode which) {
+  const pos_type failed(off_type(-1));
+  if (!(which & std::ios_base::in) || eback() == egptr()) return failed;
+  off_type base = 0;
+  if (dir == std::ios_base::cur)
+    base = gptr() - eback();
+  else if (dir == std::ios_base::end)
+    base = egptr() - eback();
+  off_type target = base + off;
+  if (target < 0 || target > egptr() - eback()) return failed;
+  setg(eback(), eback() + target, egptr());
+  return pos_type(target);
+}
+
+vector_streambuf::pos_type vector_streambuf::seekpos(pos_type pos, std::ios_base::openmode which) {
+  return seekoff(off_type(pos), std::ios_base::beg, which);
+}
+
+std::streamsize vector_streambuf::showmanyc() {
+  std::streamsize left = egptr() - gptr();
+  return left > 0 ? left : -1;
+}
+
+vector_istream::vector_istream(const ByteVector& bytes) : std::istream(nullptr), buffer_(bytes) { init(&buffer_); }
+
+vector_istream::vector_istream(const std::uint8_t* data, std::size_t size)
+    : std::istream(nullptr), buffer_(data, size) {
+  init(&buffer_);
+}
+
+void requireExhausted(std::istream& in) {
+  check(in.peek() == std::istream::traits_type::eof(), "valid external length");
+}
+
+void requireWritten(std::ostream& out) { check(!out.fail(), "successful write()"); }
+
+}  // namespace util

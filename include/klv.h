@@ -1,0 +1,1095 @@
+// Zelta: core values, value conversion, failure reporting and the KLV layer.
+#ifndef ZELTA_KLV_H
+#define ZELTA_KLV_H
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <exception>
+#include <ios>
+#include <iosfwd>
+#include <istream>
+#include <memory>
+#include <sstream>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#include <boost/iostreams/categories.hpp>
+#include <boost/iostreams/stream.hpp>
+
+typedef std::vector<std::uint8_t> ByteVector;
+
+// ---------------------------------------------------------------------------
+// Failure reporting by checks
+
+namespace util {
+
+// A broken rule of program logic, a caller's fault, or a malformed value in
+// already delimited octets.
+class assertion_failure : public std::exception {
+public:
+  explicit assertion_failure(const std::string& condition);
+  const char* what() const noexcept override;
+
+private:
+  std::string message_;
+};
+
+}  // namespace util
+
+// Throws util::assertion_failure with the text when the condition is false.
+// Texts say what must hold.
+inline void check(bool condition, const char* text) {
+  if (!condition) throw util::assertion_failure(text);
+}
+inline void check(bool condition, const std::string& text) {
+  if (!condition) throw util::assertion_failure(text);
+}
+
+// ---------------------------------------------------------------------------
+// Keys and identifiers
+
+// A 16-octet SMPTE universal label. Octet 7, the registry version, takes no
+// part in equality or order.
+class KLVKey {
+public:
+  static constexpr std::size_t size() { return 16; }
+
+  constexpr KLVKey() : octets_{} {}
+  constexpr explicit KLVKey(const std::array<std::uint8_t, 16>& octets) : octets_(octets) {}
+  explicit KLVKey(const std::uint8_t* octets) { std::memcpy(octets_.data(), octets, 16); }
+
+  constexpr std::uint8_t operator[](std::size_t i) const { return octets_[i]; }
+  std::uint8_t& operator[](std::size_t i) { return octets_[i]; }
+  const std::uint8_t* data() const { return octets_.data(); }
+  std::uint8_t* data() { return octets_.data(); }
+  const std::array<std::uint8_t, 16>& octets() const { return octets_; }
+
+  bool operator==(const KLVKey& other) const {
+    return std::memcmp(octets_.data(), other.octets_.data(), 7) == 0 &&
+           std::memcmp(octets_.data() + 8, other.octets_.data() + 8, 8) == 0;
+  }
+  bool operator!=(const KLVKey& other) const { return !(*this == other); }
+  bool operator<(const KLVKey& other) const {
+    int c = std::memcmp(octets_.data(), other.octets_.data(), 7);
+    if (c != 0) return c < 0;
+    return std::memcmp(octets_.data() + 8, other.octets_.data() + 8, 8) < 0;
+  }
+  bool operator>(const KLVKey& other) const { return other < *this; }
+  bool operator<=(const KLVKey& other) const { return !(other < *this); }
+  bool operator>=(const KLVKey& other) const { return !(*this < other); }
+
+private:
+  std::array<std::uint8_t, 16> octets_;
+};
+
+// Sixteen upper-case two-digit hexadecimal octets joined by "."; the
+// stream's flags and fill are left as they were.
+std::ostream& operator<<(std::ostream& out, const KLVKey& key);
+
+// A key with a mask: a zero octet of the pattern, and octet 7 always, are
+// wildcards.
+class KLVKeyPattern {
+public:
+  constexpr explicit KLVKeyPattern(const std::array<std::uint8_t, 16>& pattern)
+      : pattern_(pattern), mask_(maskOf(pattern)) {}
+
+  bool matches(const KLVKey& key) const {
+    for (std::size_t i = 0; i < 16; ++i)
+      if (mask_[i] & (key[i] ^ pattern_[i])) return false;
+    return true;
+  }
+  const std::array<std::uint8_t, 16>& pattern() const { return pattern_; }
+  const std::array<std::uint8_t, 16>& mask() const { return mask_; }
+  // Narrows or widens a family by hand.
+  constexpr KLVKeyPattern withMask(std::size_t i, std::uint8_t m) const {
+    KLVKeyPattern p = *this;
+    p.mask_[i] = m;
+    return p;
+  }
+
+private:
+  static constexpr std::array<std::uint8_t, 16> maskOf(const std::array<std::uint8_t, 16>& p) {
+    std::array<std::uint8_t, 16> m{};
+    for (std::size_t i = 0; i < 16; ++i) m[i] = (i == 7 || p[i] == 0) ? 0x00 : 0xFF;
+    return m;
+  }
+  std::array<std::uint8_t, 16> pattern_;
+  std::array<std::uint8_t, 16> mask_;
+};
+
+// 16 opaque octets: instance, generation and error identifiers.
+class MXFUID {
+public:
+  constexpr MXFUID() : octets_{} {}
+  constexpr explicit MXFUID(const std::array<std::uint8_t, 16>& octets) : octets_(octets) {}
+  explicit MXFUID(const std::uint8_t* octets) { std::memcpy(octets_.data(), octets, 16); }
+
+  constexpr std::uint8_t operator[](std::size_t i) const { return octets_[i]; }
+  std::uint8_t& operator[](std::size_t i) { return octets_[i]; }
+  const std::uint8_t* data() const { return octets_.data(); }
+  std::uint8_t* data() { return octets_.data(); }
+  const std::array<std::uint8_t, 16>& octets() const { return octets_; }
+
+  bool operator==(const MXFUID& o) const { return octets_ == o.octets_; }
+  bool operator!=(const MXFUID& o) const { return octets_ != o.octets_; }
+  bool operator<(const MXFUID& o) const { return octets_ < o.octets_; }
+
+private:
+  std::array<std::uint8_t, 16> octets_;
+};
+
+class MXFUIDGenerator {
+public:
+  virtual ~MXFUIDGenerator();
+  virtual MXFUID generate() = 0;
+};
+
+// Identifiers as uuid_generate makes them.
+class ZeltaDefaultUIDGenerator : public MXFUIDGenerator {
+public:
+  MXFUID generate() override;
+};
+
+// SMPTE 330M unique material identifier: kind 0 basic (32 octets) or 1
+// extended (64 octets).
+struct UMID {
+  enum Kind : std::uint8_t { basic = 0, extended = 1 };
+
+  UMID();
+  UMID(Kind kind, const ByteVector& octets);
+
+  // A new material number: the fixed label, the caller's material type,
+  // creation method 0x23, instance 0 and 16 octets of uuid_generate.
+  static UMID createNew(std::uint8_t materialType, Kind kind = basic);
+
+  Kind kind;
+  ByteVector octets;
+
+  bool operator==(const UMID& o) const { return kind == o.kind && octets == o.octets; }
+  bool operator!=(const UMID& o) const { return !(*this == o); }
+};
+
+struct MXFRational {
+  std::int32_t numerator = 0;
+  std::int32_t denominator = 0;
+  bool operator==(const MXFRational& o) const { return numerator == o.numerator && denominator == o.denominator; }
+  bool operator!=(const MXFRational& o) const { return !(*this == o); }
+};
+
+struct MXFTimestamp {
+  std::uint16_t year = 0;
+  std::uint8_t month = 0;
+  std::uint8_t day = 0;
+  std::uint8_t hour = 0;
+  std::uint8_t minute = 0;
+  std::uint8_t second = 0;
+  std::uint8_t quarterMillisecond = 0;
+  bool operator==(const MXFTimestamp& o) const;
+  bool operator!=(const MXFTimestamp& o) const { return !(*this == o); }
+};
+
+struct MXFProductVersion {
+  std::uint16_t major = 0;
+  std::uint16_t minor = 0;
+  std::uint16_t tertiary = 0;
+  std::uint16_t patch = 0;
+  std::uint16_t release = 0;
+  bool operator==(const MXFProductVersion& o) const;
+  bool operator!=(const MXFProductVersion& o) const { return !(*this == o); }
+};
+
+// A 12-bit mantissa and a signed exponent from -8 to 7.
+struct Decimal16 {
+  std::uint16_t mantissa = 0;
+  std::int8_t exponent = 0;
+  bool operator==(const Decimal16& o) const { return mantissa == o.mantissa && exponent == o.exponent; }
+  bool operator!=(const Decimal16& o) const { return !(*this == o); }
+};
+
+// IEEE 754 half precision held apart; built from a float it saturates at
+// 65504 instead of becoming infinite.
+struct Binary16 {
+  Binary16() = default;
+  explicit Binary16(float value);
+  float toFloat() const;
+
+  bool sign = false;
+  std::uint16_t mantissa = 0;
+  std::uint8_t exponent = 0;
+  bool operator==(const Binary16& o) const {
+    return sign == o.sign && mantissa == o.mantissa && exponent == o.exponent;
+  }
+  bool operator!=(const Binary16& o) const { return !(*this == o); }
+};
+
+// ---------------------------------------------------------------------------
+// Failure reporting to the client
+
+// A stream position, -1 when unknown.
+class Locator {
+public:
+  virtual ~Locator();
+  virtual const std::streampos& getPosition() = 0;
+};
+
+class ErrorHandler {
+public:
+  virtual ~ErrorHandler();
+  virtual void setLocator(Locator* locator) = 0;
+  virtual void start() = 0;
+  virtual void end() = 0;
+  virtual void warning(const MXFUID& identifier, const std::string& message) = 0;
+  virtual void error(const MXFUID& identifier, const std::string& message) = 0;
+  virtual void fatalError(const MXFUID& identifier, const std::string& message) = 0;
+};
+
+// Error identifiers: a family, a code and a fixed tail.
+constexpr MXFUID ZeltaErrorId(std::uint8_t family0, std::uint8_t family1, std::uint8_t code0,
+                              std::uint8_t code1) {
+  return MXFUID(std::array<std::uint8_t, 16>{family0, family1, code0, code1, 0x95, 0xD8, 0x11, 0xE1, 0xBB,
+                                             0xB2, 0x10, 0x9A, 0xDD, 0x4A, 0xC6, 0x8C});
+}
+
+// Family roots.
+inline constexpr MXFUID streamFamilyId = ZeltaErrorId(0x4C, 0x4A, 0x00, 0x00);
+inline constexpr MXFUID klvFamilyId = ZeltaErrorId(0x4C, 0x4B, 0x00, 0x00);
+inline constexpr MXFUID structureFamilyId = ZeltaErrorId(0x4C, 0x4C, 0x00, 0x00);
+inline constexpr MXFUID genericContainerFamilyId = ZeltaErrorId(0x4C, 0x4D, 0x00, 0x00);
+inline constexpr MXFUID sdticpFamilyId = ZeltaErrorId(0x4C, 0x4E, 0x00, 0x00);
+inline constexpr MXFUID modelFamilyId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x00);
+inline constexpr MXFUID kitValidatorFamilyId = ZeltaErrorId(0x4C, 0x50, 0x00, 0x00);
+inline constexpr MXFUID proxySystemFamilyId = ZeltaErrorId(0x4C, 0x51, 0x00, 0x00);
+
+inline constexpr MXFUID streamFailureId = ZeltaErrorId(0x4C, 0x4A, 0x00, 0x01);
+inline constexpr MXFUID klvCodingErrorId = ZeltaErrorId(0x4C, 0x4B, 0x00, 0x01);
+inline constexpr MXFUID berLengthErrorId = ZeltaErrorId(0x4C, 0x4B, 0x00, 0x02);
+inline constexpr MXFUID klvLengthErrorId = ZeltaErrorId(0x4C, 0x4B, 0x00, 0x03);
+inline constexpr MXFUID fillItemKeyVersionId = ZeltaErrorId(0x4C, 0x4B, 0x00, 0x04);
+
+// ---------------------------------------------------------------------------
+// Streams over memory and text
+
+namespace util {
+
+// Read-only stream buffer over bytes it does not own.
+class vector_streambuf : public std::streambuf {
+public:
+  vector_streambuf();
+  explicit vector_streambuf(const ByteVector& bytes);
+  vector_streambuf(const std::uint8_t* data, std::size_t size);
+
+protected:
+  pos_type seekoff(off_type off, std::ios_base::seekdir dir,
+                   std::ios_base::openmode which = std::ios_base::in) override;
+  pos_type seekpos(pos_type pos, std::ios_base::openmode which = std::ios_base::in) override;
+  std::streamsize showmanyc() override;
+};
+
+// Input stream over a byte vector, without copying.
+class vector_istream : public std::istream {
+public:
+  explicit vector_istream(const ByteVector& bytes);
+  vector_istream(const std::uint8_t* data, std::size_t size);
+
+private:
+  vector_streambuf buffer_;
+};
+
+// Boost.Iostreams sink that appends to a byte vector.
+class byte_vector_device {
+public:
+  typedef char char_type;
+  typedef boost::iostreams::sink_tag category;
+
+  explicit byte_vector_device(ByteVector& bytes) : bytes_(&bytes) {}
+  std::streamsize write(const char* s, std::streamsize n) {
+    bytes_->insert(bytes_->end(), reinterpret_cast<const std::uint8_t*>(s),
+                   reinterpret_cast<const std::uint8_t*>(s) + n);
+    return n;
+  }
+
+private:
+  ByteVector* bytes_;
+};
+
+namespace utf8 {
+
+class exception : public std::exception {
+public:
+  const char* what() const noexcept override;
+};
+
+class invalid_code_point : public exception {
+public:
+  const char* what() const noexcept override;
+};
+
+// UTF-8 octets to code points; throws invalid_code_point on a sequence that
+// is no valid code point.
+std::wstring decode(const std::string& text);
+// Code points to UTF-8; throws invalid_code_point for a surrogate or a value
+// beyond U+10FFFF.
+std::string encode(const std::wstring& text);
+
+}  // namespace utf8
+
+}  // namespace util
+
+namespace loomlib {
+
+// String streams that never depend on the process's locale.
+class istringstream_classic : public std::istringstream {
+public:
+  istringstream_classic();
+  explicit istringstream_classic(const std::string& text);
+};
+
+class ostringstream_classic : public std::ostringstream {
+public:
+  ostringstream_classic();
+};
+
+}  // namespace loomlib
+
+// ---------------------------------------------------------------------------
+// Conversion of values to and from big-endian octets
+//
+// Stream forms read or write one value; the byte vector forms wrap them:
+// internalize requires the octets to be used up ("valid external length"),
+// externalize appends, after clearing when reset is true.
+
+namespace util {
+
+template <typename T>
+struct external_size;  // octets of the external form of fixed-size types
+template <> struct external_size<std::uint8_t> { static constexpr std::uint32_t value = 1; };
+template <> struct external_size<std::int8_t> { static constexpr std::uint32_t value = 1; };
+template <> struct external_size<bool> { static constexpr std::uint32_t value = 1; };
+template <> struct external_size<std::uint16_t> { static constexpr std::uint32_t value = 2; };
+template <> struct external_size<std::int16_t> { static constexpr std::uint32_t value = 2; };
+template <> struct external_size<std::uint32_t> { static constexpr std::uint32_t value = 4; };
+template <> struct external_size<std::int32_t> { static constexpr std::uint32_t value = 4; };
+template <> struct external_size<std::uint64_t> { static constexpr std::uint32_t value = 8; };
+template <> struct external_size<std::int64_t> { static constexpr std::uint32_t value = 8; };
+template <> struct external_size<MXFRational> { static constexpr std::uint32_t value = 8; };
+template <> struct external_size<MXFTimestamp> { static constexpr std::uint32_t value = 8; };
+template <> struct external_size<MXFProductVersion> { static constexpr std::uint32_t value = 10; };
+template <> struct external_size<KLVKey> { static constexpr std::uint32_t value = 16; };
+template <> struct external_size<MXFUID> { static constexpr std::uint32_t value = 16; };
+template <> struct external_size<Decimal16> { static constexpr std::uint32_t value = 2; };
+template <> struct external_size<Binary16> { static constexpr std::uint32_t value = 2; };
+
+inline std::uint8_t getOctet(std::istream& in) {
+  std::istream::int_type c = in.get();
+  check(c != std::istream::traits_type::eof(), "successful get()");
+  return static_cast<std::uint8_t>(c);
+}
+
+inline void putOctet(std::ostream& out, std::uint8_t octet) {
+  out.put(static_cast<char>(octet));
+}
+
+template <typename T>
+T getBigEndian(std::istream& in) {
+  typedef typename std::make_unsigned<T>::type U;
+  U v = 0;
+  for (std::size_t i = 0; i < sizeof(T); ++i) v = static_cast<U>((v << 8) | getOctet(in));
+  return static_cast<T>(v);
+}
+
+template <typename T>
+void putBigEndian(std::ostream& out, T value) {
+  typedef typename std::make_unsigned<T>::type U;
+  U v = static_cast<U>(value);
+  for (std::size_t i = sizeof(T); i-- > 0;) putOctet(out, static_cast<std::uint8_t>(v >> (8 * i)));
+}
+
+}  // namespace util
+
+inline void internalize(std::istream& in, std::uint8_t& v) { v = util::getOctet(in); }
+inline void internalize(std::istream& in, std::int8_t& v) { v = static_cast<std::int8_t>(util::getOctet(in)); }
+inline void internalize(std::istream& in, bool& v) { v = util::getOctet(in) != 0; }
+inline void internalize(std::istream& in, std::uint16_t& v) { v = util::getBigEndian<std::uint16_t>(in); }
+inline void internalize(std::istream& in, std::int16_t& v) { v = util::getBigEndian<std::int16_t>(in); }
+inline void internalize(std::istream& in, std::uint32_t& v) { v = util::getBigEndian<std::uint32_t>(in); }
+inline void internalize(std::istream& in, std::int32_t& v) { v = util::getBigEndian<std::int32_t>(in); }
+inline void internalize(std::istream& in, std::uint64_t& v) { v = util::getBigEndian<std::uint64_t>(in); }
+inline void internalize(std::istream& in, std::int64_t& v) { v = util::getBigEndian<std::int64_t>(in); }
+void internalize(std::istream& in, MXFRational& v);
+void internalize(std::istream& in, MXFTimestamp& v);
+void internalize(std::istream& in, MXFProductVersion& v);
+void internalize(std::istream& in, KLVKey& v);
+void internalize(std::istream& in, MXFUID& v);
+// 32 octets, and 32 more when the stream holds more: basic or extended.
+void internalize(std::istream& in, UMID& v);
+void internalize(std::istream& in, Decimal16& v);
+void internalize(std::istream& in, Binary16& v);
+// Big-endian UTF-16 to code points, surrogate pairs joined; reads to the end.
+void internalize(std::istream& in, std::wstring& v);
+// Octets as they stand; reads to the end.
+void internalize(std::istream& in, std::string& v);
+
+inline void externalize(std::ostream& out, std::uint8_t v) { util::putOctet(out, v); }
+inline void externalize(std::ostream& out, std::int8_t v) { util::putOctet(out, static_cast<std::uint8_t>(v)); }
+inline void externalize(std::ostream& out, bool v) { util::putOctet(out, v ? 1 : 0); }
+inline void externalize(std::ostream& out, std::uint16_t v) { util::putBigEndian(out, v); }
+inline void externalize(std::ostream& out, std::int16_t v) { util::putBigEndian(out, v); }
+inline void externalize(std::ostream& out, std::uint32_t v) { util::putBigEndian(out, v); }
+inline void externalize(std::ostream& out, std::int32_t v) { util::putBigEndian(out, v); }
+inline void externalize(std::ostream& out, std::uint64_t v) { util::putBigEndian(out, v); }
+inline void externalize(std::ostream& out, std::int64_t v) { util::putBigEndian(out, v); }
+void externalize(std::ostream& out, const MXFRational& v);
+void externalize(std::ostream& out, const MXFTimestamp& v);
+void externalize(std::ostream& out, const MXFProductVersion& v);
+void externalize(std::ostream& out, const KLVKey& v);
+void externalize(std::ostream& out, const MXFUID& v);
+void externalize(std::ostream& out, const UMID& v);
+void externalize(std::ostream& out, const Decimal16& v);
+void externalize(std::ostream& out, const Binary16& v);
+void externalize(std::ostream& out, const std::wstring& v);
+void externalize(std::ostream& out, const std::string& v);
+
+// A batch: uint32 count, uint32 item size, the items. Each item is read by
+// its own rule and then skipped to the declared item size.
+template <typename T>
+void internalize(std::istream& in, std::vector<T>& items) {
+  std::uint32_t count = 0;
+  std::uint32_t itemSize = 0;
+  internalize(in, count);
+  internalize(in, itemSize);
+  items.clear();
+  if (count == 0) return;
+  items.reserve(count);
+  for (std::uint32_t i = 0; i < count; ++i) {
+    std::streampos start = in.tellg();
+    T item;
+    internalize(in, item);
+    std::streamoff used = in.tellg() - start;
+    check(used <= static_cast<std::streamoff>(itemSize), "valid external length");
+    if (used < static_cast<std::streamoff>(itemSize)) {
+      in.seekg(static_cast<std::streamoff>(itemSize) - used, std::ios_base::cur);
+      check(!in.fail(), "successful seekg()");
+    }
+    items.push_back(item);
+  }
+}
+
+template <typename T>
+void externalize(ByteVector& bytes, const T& value, bool reset);
+
+// Items are written at the fixed size of their type ("valid entry
+// externalize()").
+template <typename T>
+void externalize(std::ostream& out, const std::vector<T>& items) {
+  constexpr std::uint32_t itemSize = util::external_size<T>::value;
+  externalize(out, static_cast<std::uint32_t>(items.size()));
+  externalize(out, itemSize);
+  ByteVector item;
+  for (const T& value : items) {
+    externalize(item, value, true);
+    check(item.size() == itemSize, "valid entry externalize()");
+    out.write(reinterpret_cast<const char*>(item.data()), itemSize);
+  }
+}
+
+namespace util {
+// Requires an input stream to be used up.
+void requireExhausted(std::istream& in);
+// Requires the last write to have succeeded.
+void requireWritten(std::ostream& out);
+}  // namespace util
+
+template <typename T>
+void internalize(const ByteVector& bytes, T& value) {
+  util::vector_istream in(bytes);
+  internalize(in, value);
+  util::requireExhausted(in);
+}
+
+template <typename T>
+void externalize(ByteVector& bytes, const T& value, bool reset) {
+  if (reset) bytes.clear();
+  boost::iostreams::stream<util::byte_vector_device> out(bytes);
+  externalize(out, value);
+  out.flush();
+  util::requireWritten(out);
+}
+
+// ---------------------------------------------------------------------------
+// KLV events
+
+// Tag types: octets 1, 2, 4. Length types: BER, fixed 1, 2, 4 octets.
+typedef std::uint8_t KLVTagType;
+typedef std::uint8_t KLVLengthType;
+inline constexpr KLVTagType KLVTagType1 = 0;
+inline constexpr KLVTagType KLVTagType2 = 1;
+inline constexpr KLVTagType KLVTagType4 = 2;
+inline constexpr KLVLengthType KLVLengthTypeBER = 0;
+inline constexpr KLVLengthType KLVLengthType1 = 1;
+inline constexpr KLVLengthType KLVLengthType2 = 2;
+inline constexpr KLVLengthType KLVLengthType4 = 3;
+
+// Octets of a tag type ("valid tag type") and of a fixed length type ("valid
+// length type"); the label of a length type for messages.
+unsigned KLVTagTypeOctets(KLVTagType tagType);
+unsigned KLVFixedLengthTypeOctets(KLVLengthType lengthType);
+const char* KLVLengthTypeLabel(KLVLengthType lengthType);
+
+// The BER form value that no stream ever has: the start of every current form.
+inline constexpr std::uint8_t KLVNoLengthForm = 0x80;
+
+// Octets of a BER length of a form: 1 for short form, (form & 127) + 1 for
+// long form ("valid BER length form").
+unsigned lengthFormOctets(std::uint8_t form);
+// The same for length type BER, the fixed size otherwise.
+unsigned lengthTypeOctets(KLVLengthType lengthType, std::uint8_t form);
+
+// Coding of a key by its octet 5. Each checks the key's family first ("valid
+// local set key", "valid variable length pack key", "valid wrapper key") and
+// answers false for an octet 5 that the coding does not allow.
+bool KLVLocalSetCoding(const KLVKey& key, KLVTagType& tagType, KLVLengthType& lengthType);
+bool KLVVariableLengthPackCoding(const KLVKey& key, KLVLengthType& lengthType);
+bool KLVWrapperCoding(const KLVKey& key, bool& isWrapper);
+
+inline constexpr KLVKey KLVFillItemKey{
+    std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, 0x01, 0x03, 0x01, 0x02, 0x10, 0x01, 0x00,
+                                 0x00, 0x00}};
+
+// The fill item key version, a stream attribute; 0 is unset.
+void setFillItemKeyVersion(std::ios_base& stream, std::uint8_t version);
+std::uint8_t getFillItemKeyVersion(std::ios_base& stream);
+
+class KLVHandler {
+public:
+  virtual ~KLVHandler();
+  virtual void setLocator(Locator* locator) = 0;
+  virtual void startStream(bool hasAccurateLengths) = 0;
+  virtual void endStream(bool aborted) = 0;
+  virtual void setLengthForm(std::uint8_t form) = 0;
+  virtual bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) = 0;
+  virtual void endIndividualItem(const KLVKey& key) = 0;
+  virtual bool startLabel(const KLVKey& key) = 0;
+  virtual void endLabel(const KLVKey& key) = 0;
+  virtual bool startUniversalSet(const KLVKey& key, std::uint64_t length) = 0;
+  virtual void endUniversalSet(const KLVKey& key) = 0;
+  virtual bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                             KLVLengthType lengthType) = 0;
+  virtual void endLocalSet(const KLVKey& key) = 0;
+  virtual bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) = 0;
+  virtual void endLocalItem(std::uint32_t tag) = 0;
+  virtual bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) = 0;
+  virtual void endFixedLengthPack(const KLVKey& key) = 0;
+  virtual bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) = 0;
+  virtual void endVariableLengthPack(const KLVKey& key) = 0;
+  virtual bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) = 0;
+  virtual void endVariableLengthItem() = 0;
+  virtual bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) = 0;
+  virtual void endWrapper(const KLVKey& key) = 0;
+  virtual void value(const std::uint8_t* data, std::streamsize size) = 0;
+};
+
+// Ignores every event and declines every value.
+class DullKLVHandler : public KLVHandler {
+public:
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+};
+
+class KLVFilter : public KLVHandler {
+public:
+  virtual void setHandler(KLVHandler* handler) = 0;
+  virtual KLVHandler* getHandler() const = 0;
+};
+
+// Passes every event on unchanged to the next handler ("handler is present").
+class DullKLVFilter : public KLVFilter {
+public:
+  DullKLVFilter();
+  explicit DullKLVFilter(KLVHandler* handler);
+
+  void setHandler(KLVHandler* handler) override;
+  KLVHandler* getHandler() const override;
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+private:
+  KLVHandler* handler_;
+};
+
+// ---------------------------------------------------------------------------
+// Locators
+
+// A position that stays at zero.
+class NullLocator : public Locator {
+public:
+  const std::streampos& getPosition() override;
+
+private:
+  std::streampos position_ = 0;
+};
+
+// A position that its owner refreshes from a stream.
+class InputLocator : public Locator {
+public:
+  const std::streampos& getPosition() override;
+  void setPosition(const std::streampos& position) { position_ = position; }
+
+private:
+  std::streampos position_ = -1;
+};
+
+// ---------------------------------------------------------------------------
+// Position filters and the fill item key check
+
+// Takes the position from the input stream before every event; the position
+// at a start event is the first octet of the value.
+class KLVTeller : public DullKLVFilter {
+public:
+  KLVTeller(std::istream& stream, KLVHandler* handler = nullptr);
+  Locator* getLocator();
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+private:
+  void refresh();
+  std::istream* stream_;
+  InputLocator locator_;
+};
+
+// Computes the position from the events alone, for pipes and output chains.
+class KLVMonitor : public DullKLVFilter {
+public:
+  class MonitoredLocator : public Locator {
+  public:
+    const std::streampos& getPosition() override;
+    void reset() { position_ = 0; }
+    void advance(std::streamoff octets) { position_ += octets; }
+
+  private:
+    std::streampos position_ = 0;
+  };
+
+  explicit KLVMonitor(KLVHandler* handler = nullptr);
+  Locator* getLocator();
+  MonitoredLocator& getMonitoredLocator() { return locator_; }
+  // Octets of the current BER length ("BER length form has been reported").
+  unsigned getLengthOctets() const;
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+private:
+  bool noteStart(bool taken, std::uint64_t length);
+  void endElement();
+
+  MonitoredLocator locator_;
+  unsigned lengthOctets_ = 0;
+  unsigned tagOctets_ = 0;
+  unsigned itemLengthOctets_ = 0;
+  bool itemLengthIsBER_ = false;
+  std::uint64_t skipped_ = 0;
+};
+
+// Warns once per stream of a fill item key whose version octet is not the
+// stream's, or not 1 or 2 when the stream has none.
+class KLVFillItemKeyFilter : public DullKLVFilter {
+public:
+  KLVFillItemKeyFilter(KLVHandler* handler, std::uint8_t fillItemKeyVersion, ErrorHandler* errorHandler);
+
+  void startStream(bool hasAccurateLengths) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+
+private:
+  void inspect(const KLVKey& key);
+  std::uint8_t version_;
+  ErrorHandler* errorHandler_;
+  bool warned_ = false;
+};
+
+// ---------------------------------------------------------------------------
+// Reading
+
+class KLVElement {
+public:
+  // A fault of the data or the stream, with its identifier.
+  class parse_error : public std::runtime_error {
+  public:
+    parse_error(const MXFUID& identifier, const std::string& message);
+    const MXFUID& getIdentifier() const { return identifier_; }
+
+  private:
+    MXFUID identifier_;
+  };
+
+  // The element for a key by its octets 4 and 5; throws parse_error for a
+  // key the coding does not allow.
+  static std::unique_ptr<KLVElement> create(const KLVKey& key, std::istream& stream, KLVHandler& handler,
+                                            std::uint8_t& currentForm, Locator& locator, bool seekable);
+
+  virtual ~KLVElement();
+  virtual void parse() = 0;
+
+  const KLVKey& getKey() const { return key_; }
+
+protected:
+  KLVElement(const KLVKey& key, std::istream& stream, KLVHandler& handler, std::uint8_t& currentForm,
+             Locator& locator, bool seekable);
+
+  KLVKey key_;
+  std::istream* stream_;
+  KLVHandler* handler_;
+  std::uint8_t* currentForm_;
+  Locator* locator_;
+  bool seekable_;
+};
+
+class KLVReader {
+public:
+  virtual ~KLVReader();
+  virtual void setHandler(KLVHandler* handler) = 0;
+  virtual KLVHandler* getHandler() const = 0;
+  virtual void setErrorHandler(ErrorHandler* errorHandler) = 0;
+  virtual ErrorHandler* getErrorHandler() const = 0;
+  virtual void read(std::istream& stream) = 0;
+  // Stops after the first top-level element that ends at or beyond stop; -1
+  // reads to the end.
+  virtual void read(std::istream& stream, std::streampos stop) = 0;
+};
+
+class GenericKLVReader : public KLVReader {
+public:
+  GenericKLVReader();
+  void setHandler(KLVHandler* handler) override;
+  KLVHandler* getHandler() const override;
+  void setErrorHandler(ErrorHandler* errorHandler) override;
+  ErrorHandler* getErrorHandler() const override;
+  void read(std::istream& stream) override;
+  void read(std::istream& stream, std::streampos stop) override;
+
+private:
+  KLVHandler* handler_;
+  ErrorHandler* errorHandler_;
+};
+
+// ---------------------------------------------------------------------------
+// Writing
+
+// Turns KLV events back into octets. Its start events take every value by
+// `value` events; the producer chooses the BER form by setLengthForm.
+class GenericKLVWriter : public KLVHandler {
+public:
+  explicit GenericKLVWriter(std::ostream& stream);
+
+  std::uint8_t getLengthForm() const;
+  unsigned getLongFormOctets() const;  // "long form"
+  void setTagType(KLVTagType tagType);
+  KLVTagType getTagType() const;
+  void setLengthType(KLVLengthType lengthType);
+  KLVLengthType getLengthType() const;
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+private:
+  void writeKey(const KLVKey& key);
+  void writeBERLength(std::uint64_t length);
+  void writeItemLength(std::uint64_t length);
+
+  std::ostream* stream_;
+  std::uint8_t fillItemKeyVersion_ = 255;
+  bool started_ = false;
+  bool buffered_ = false;
+  std::uint8_t currentForm_ = KLVNoLengthForm;
+  KLVTagType tagType_ = KLVTagType1;
+  KLVLengthType lengthType_ = KLVLengthTypeBER;
+};
+
+// Calls beforeEvent, the next handler and afterEvent around every event.
+class ActionKLVFilter : public DullKLVFilter {
+public:
+  using DullKLVFilter::DullKLVFilter;
+  virtual void beforeEvent() = 0;
+  virtual void afterEvent() = 0;
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+};
+
+// Forwards every event to what getHandler answers at that moment.
+class KLVForwarder : public KLVHandler {
+public:
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+  virtual KLVHandler* getHandler() = 0;
+};
+
+// Producers' helpers that drive any handler.
+void writeIndividualItem(KLVHandler& handler, const KLVKey& key, const std::uint8_t* data, std::uint64_t length);
+void writeFixedLengthPack(KLVHandler& handler, const KLVKey& key, const ByteVector& bytes);
+typedef std::vector<std::pair<std::uint32_t, ByteVector>> KLVLocalItems;
+void writeLocalSet(KLVHandler& handler, const KLVKey& key, const KLVLocalItems& items, std::uint8_t form);
+// A fill item of value length `length` under the form.
+void writeFillItem(KLVHandler& handler, std::uint64_t length, std::uint8_t form);
+
+// ---------------------------------------------------------------------------
+// Padding, stream joining and verification
+
+// Pads what passes between startFilledItem and endFilledItem to alignment
+// (mode 0) or to an exact length (mode 1) with one fill item.
+class KLVFiller : public DullKLVFilter {
+public:
+  enum FillMode { alignmentMode = 0, exactLengthMode = 1 };
+
+  explicit KLVFiller(KLVHandler* handler = nullptr);
+
+  virtual Locator* getLocator();  // "locator is present"
+  virtual void setFillMode(int mode, std::uint64_t alignment, std::uint64_t paddedLength);
+  virtual int getFillMode() const;
+  virtual std::uint64_t getAlignment() const;
+  virtual std::uint64_t getPaddedLength() const;
+  virtual void startFilledItem();
+  virtual void endFilledItem();
+
+  void setLocator(Locator* locator) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+
+private:
+  Locator* locator_ = nullptr;
+  std::uint8_t currentForm_ = KLVNoLengthForm;
+  int mode_ = alignmentMode;
+  std::uint64_t alignment_ = 0;
+  std::uint64_t paddedLength_ = 0;
+  std::streampos start_ = 0;
+  bool inFilledItem_ = false;
+};
+
+// Pads a whole stream: the fill comes last in it.
+class KLVStreamPadder : public KLVFiller {
+public:
+  using KLVFiller::KLVFiller;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+};
+
+// Hides stream boundaries, so that producers can write in turn into one
+// continuing stream.
+class KLVStreamFilter : public DullKLVFilter {
+public:
+  using DullKLVFilter::DullKLVFilter;
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+};
+
+// Compares the keys and lengths of a producer's events with a stream that
+// already holds them; throws VerifyingKLVHandler::exception at the first
+// difference.
+class VerifyingKLVHandler : public KLVHandler {
+public:
+  class exception : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+  };
+
+  explicit VerifyingKLVHandler(std::istream& stream, KLVHandler* handler = nullptr);
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endLocalItem(std::uint32_t tag) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
+  void endVariableLengthItem() override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+private:
+  bool verify(const KLVKey& key, std::uint64_t length, bool hasLength);
+
+  std::istream* stream_;
+  KLVHandler* handler_;
+  std::uint8_t currentForm_ = KLVNoLengthForm;
+};
+
+// Moves the stream to the next 06 0E 2B 34 within limit octets (-1: no
+// limit); false at the end of the stream or past the limit.
+bool findKey(std::istream& stream, std::streamoff limit);
+
+#endif

@@ -1,0 +1,186 @@
+#include "klv/elements.h"
+
+#include <cstring>
+
+#include "klv/ber.h"
+#include "klv/messages.h"
+#include "klv/stream_input.h"
+
+using zelta::klv::readBERLength;
+using zelta::klv::readBigEndian;
+using zelta::klv::readKey;
+using zelta::klv::skipValue;
+using zelta::klv::transferValue;
+using zelta::klv::withKey;
+using zelta::klv::withOctet;
+
+namespace {
+
+constexpr std::uint8_t smptePrefix[4] = {0x06, 0x0E, 0x2B, 0x34};
+
+// Group codings by the low three bits of key octet 5.
+constexpr std::uint8_t universalSetCoding = 1;
+constexpr std::uint8_t localSetCoding = 3;
+constexpr std::uint8_t variableLengthPackCoding = 4;
+constexpr std::uint8_t fixedLengthPackCoding = 5;
+
+// Contents are counted by the locator, so nested events must reach the
+// position filter.
+std::uint64_t octetsSince(Locator& locator, const std::streampos& start) {
+  return static_cast<std::uint64_t>(static_cast<std::streamoff>(locator.getPosition() - start));
+}
+
+std::uint64_t readItemLength(std::istream& stream, KLVLengthType lengthType, std::uint8_t& currentForm,
+                             KLVHandler& handler) {
+  if (lengthType == KLVLengthTypeBER) return readBERLength(stream, currentForm, handler);
+  return readBigEndian(stream, KLVFixedLengthTypeOctets(lengthType));
+}
+
+}  // namespace
+
+std::unique_ptr<KLVElement> KLVElement::create(const KLVKey& key, std::istream& stream, KLVHandler& handler,
+                                               std::uint8_t& currentForm, Locator& locator, bool seekable) {
+  if (std::memcmp(key.data(), smptePrefix, sizeof smptePrefix) != 0)
+    throw parse_error(klvCodingErrorId, withKey("invalid SMPTE key", key));
+  switch (key[4]) {
+    case 1:
+      return std::unique_ptr<KLVElement>(new KLVIndividualItem(key, stream, handler, currentForm, locator, seekable));
+    case 2:
+      switch (key[5] & 7) {
+        case universalSetCoding:
+          return std::unique_ptr<KLVElement>(new KLVUniversalSet(key, stream, handler, currentForm, locator, seekable));
+        case localSetCoding:
+          return std::unique_ptr<KLVElement>(new KLVLocalSet(key, stream, handler, currentForm, locator, seekable));
+        case variableLengthPackCoding:
+          return std::unique_ptr<KLVElement>(
+              new KLVVariableLengthPack(key, stream, handler, currentForm, locator, seekable));
+        case fixedLengthPackCoding:
+          return std::unique_ptr<KLVElement>(
+              new KLVFixedLengthPack(key, stream, handler, currentForm, locator, seekable));
+      }
+      break;
+    case 3:
+      return std::unique_ptr<KLVElement>(new KLVWrapper(key, stream, handler, currentForm, locator, seekable));
+    case 4:
+      return std::unique_ptr<KLVElement>(new KLVLabel(key, stream, handler, currentForm, locator, seekable));
+  }
+  throw parse_error(klvCodingErrorId, withKey("unimplemented SMPTE KLV coding", key));
+}
+
+void KLVIndividualItem::parse() {
+  const std::uint64_t length = readBERLength(*stream_, *currentForm_, *handler_);
+  std::uint8_t* buffer = nullptr;
+  const bool taken = handler_->startIndividualItem(key_, length, buffer);
+  transferValue(*stream_, *handler_, taken, length, buffer, seekable_);
+  handler_->endIndividualItem(key_);
+}
+
+void KLVFixedLengthPack::parse() {
+  const std::uint64_t length = readBERLength(*stream_, *currentForm_, *handler_);
+  std::uint8_t* buffer = nullptr;
+  const bool taken = handler_->startFixedLengthPack(key_, length, buffer);
+  transferValue(*stream_, *handler_, taken, length, buffer, seekable_);
+  handler_->endFixedLengthPack(key_);
+}
+
+bool KLVWrapper::isWrapper() const {
+  bool wrapper = false;
+  if (!KLVWrapperCoding(key_, wrapper)) throw parse_error(klvCodingErrorId, withOctet("invalid wrapper type", key_[5]));
+  return wrapper;
+}
+
+void KLVWrapper::parse() {
+  const std::uint64_t length = readBERLength(*stream_, *currentForm_, *handler_);
+  std::uint8_t* buffer = nullptr;
+  const bool taken = handler_->startWrapper(key_, length, isWrapper(), buffer);
+  transferValue(*stream_, *handler_, taken, length, buffer, seekable_);
+  handler_->endWrapper(key_);
+}
+
+// A label is a key alone: the next octet is the next key.
+void KLVLabel::parse() {
+  handler_->startLabel(key_);
+  handler_->endLabel(key_);
+}
+
+void KLVUniversalSet::parse() {
+  const std::uint64_t length = readBERLength(*stream_, *currentForm_, *handler_);
+  if (!handler_->startUniversalSet(key_, length)) {
+    skipValue(*stream_, length, seekable_);
+  } else {
+    const std::streampos start = locator_->getPosition();
+    while (octetsSince(*locator_, start) < length)
+      create(readKey(*stream_), *stream_, *handler_, *currentForm_, *locator_, seekable_)->parse();
+    if (octetsSince(*locator_, start) != length) throw parse_error(klvLengthErrorId, "incorrect universal set length");
+  }
+  handler_->endUniversalSet(key_);
+}
+
+void KLVLocalSet::coding(KLVTagType& tagType, KLVLengthType& lengthType) const {
+  if (!KLVLocalSetCoding(key_, tagType, lengthType))
+    throw parse_error(klvCodingErrorId, withOctet("invalid local set type", key_[5]));
+}
+
+KLVTagType KLVLocalSet::getTagType() const {
+  KLVTagType tagType = 0;
+  KLVLengthType lengthType = 0;
+  coding(tagType, lengthType);
+  return tagType;
+}
+
+KLVLengthType KLVLocalSet::getLengthType() const {
+  KLVTagType tagType = 0;
+  KLVLengthType lengthType = 0;
+  coding(tagType, lengthType);
+  return lengthType;
+}
+
+void KLVLocalSet::parse() {
+  const std::uint64_t length = readBERLength(*stream_, *currentForm_, *handler_);
+  KLVTagType tagType = 0;
+  KLVLengthType lengthType = 0;
+  coding(tagType, lengthType);
+  if (!handler_->startLocalSet(key_, length, tagType, lengthType)) {
+    skipValue(*stream_, length, seekable_);
+  } else {
+    const unsigned tagOctets = KLVTagTypeOctets(tagType);
+    const std::streampos start = locator_->getPosition();
+    while (octetsSince(*locator_, start) < length) {
+      const auto tag = static_cast<std::uint32_t>(readBigEndian(*stream_, tagOctets));
+      const std::uint64_t itemLength = readItemLength(*stream_, lengthType, *currentForm_, *handler_);
+      std::uint8_t* buffer = nullptr;
+      const bool taken = handler_->startLocalItem(tag, itemLength, buffer);
+      transferValue(*stream_, *handler_, taken, itemLength, buffer, seekable_);
+      handler_->endLocalItem(tag);
+    }
+    if (octetsSince(*locator_, start) != length) throw parse_error(klvLengthErrorId, "incorrect local set length");
+  }
+  handler_->endLocalSet(key_);
+}
+
+KLVLengthType KLVVariableLengthPack::getLengthType() const {
+  KLVLengthType lengthType = 0;
+  if (!KLVVariableLengthPackCoding(key_, lengthType))
+    throw parse_error(klvCodingErrorId, withOctet("invalid variable length pack type", key_[5]));
+  return lengthType;
+}
+
+void KLVVariableLengthPack::parse() {
+  const std::uint64_t length = readBERLength(*stream_, *currentForm_, *handler_);
+  const KLVLengthType lengthType = getLengthType();
+  if (!handler_->startVariableLengthPack(key_, length, lengthType)) {
+    skipValue(*stream_, length, seekable_);
+  } else {
+    const std::streampos start = locator_->getPosition();
+    while (octetsSince(*locator_, start) < length) {
+      const std::uint64_t itemLength = readItemLength(*stream_, lengthType, *currentForm_, *handler_);
+      std::uint8_t* buffer = nullptr;
+      const bool taken = handler_->startVariableLengthItem(itemLength, buffer);
+      transferValue(*stream_, *handler_, taken, itemLength, buffer, seekable_);
+      handler_->endVariableLengthItem();
+    }
+    if (octetsSince(*locator_, start) != length)
+      throw parse_error(klvLengthErrorId, "incorrect variable length pack length");
+  }
+  handler_->endVariableLengthPack(key_);
+}

@@ -1,0 +1,7 @@
+#include "klv.h"
+
+const std::streampos& NullLocator::getPosition() { return position_; }
+
+const std::streampos& InputLocator::getPosition() { return position_; }
+
+const std::streampos& KLVMonitor::MonitoredLocator::getPosition() { return position_; }

@@ -1,0 +1,88 @@
+#include "klv/stream_input.h"
+
+#include <algorithm>
+#include <array>
+#include <limits>
+
+namespace zelta::klv {
+
+namespace {
+
+constexpr std::streamsize chunkOctets = 65536;
+constexpr std::uint64_t largestOffset = static_cast<std::uint64_t>(std::numeric_limits<std::streamoff>::max());
+
+void seekForward(std::istream& stream, std::streamoff octets) {
+  stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
+  stream.seekg(octets, std::ios_base::cur);
+  if (stream.fail()) throw KLVElement::parse_error(streamFailureId, "unsuccessful seekg()");
+}
+
+void ignoreForward(std::istream& stream, std::streamsize octets) {
+  stream.ignore(octets);
+  // ignore() looks one octet beyond the count and may meet the end there.
+  if (stream.eof() && stream.gcount() == octets) stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
+  if (!stream.good()) throw KLVElement::parse_error(streamFailureId, "unsuccessful ignore()");
+}
+
+void skipPiece(std::istream& stream, std::streamoff octets, bool seekable) {
+  if (seekable)
+    seekForward(stream, octets);
+  else
+    ignoreForward(stream, octets);
+}
+
+}  // namespace
+
+void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n) {
+  stream.read(reinterpret_cast<char*>(octets), n);
+  if (stream.gcount() != n) throw KLVElement::parse_error(streamFailureId, "unsuccessful read()");
+}
+
+std::uint64_t readBigEndian(std::istream& stream, unsigned octets) {
+  std::array<std::uint8_t, 8> bytes;
+  readOctets(stream, bytes.data(), octets);
+  std::uint64_t value = 0;
+  for (unsigned i = 0; i < octets; ++i) value = (value << 8) | bytes[i];
+  return value;
+}
+
+KLVKey readKey(std::istream& stream) {
+  KLVKey key;
+  readOctets(stream, key.data(), KLVKey::size());
+  return key;
+}
+
+void takeValue(std::istream& stream, KLVHandler& handler, std::uint64_t length, std::uint8_t* buffer) {
+  if (buffer) {
+    const std::streamsize size = static_cast<std::streamsize>(length);
+    readOctets(stream, buffer, size);
+    handler.value(buffer, size);
+    return;
+  }
+  std::array<std::uint8_t, chunkOctets> chunk;
+  while (length > 0) {
+    const std::streamsize n = static_cast<std::streamsize>(std::min<std::uint64_t>(length, chunkOctets));
+    readOctets(stream, chunk.data(), n);
+    handler.value(chunk.data(), n);
+    length -= static_cast<std::uint64_t>(n);
+  }
+}
+
+void skipValue(std::istream& stream, std::uint64_t length, bool seekable) {
+  // Lengths beyond the largest offset take two pieces.
+  if (length > largestOffset) {
+    skipPiece(stream, static_cast<std::streamoff>(largestOffset), seekable);
+    length -= largestOffset;
+  }
+  if (length > 0) skipPiece(stream, static_cast<std::streamoff>(length), seekable);
+}
+
+void transferValue(std::istream& stream, KLVHandler& handler, bool taken, std::uint64_t length, std::uint8_t* buffer,
+                   bool seekable) {
+  if (taken)
+    takeValue(stream, handler, length, buffer);
+  else
+    skipValue(stream, length, seekable);
+}
+
+}  // namespace zelta::klv

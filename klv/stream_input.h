@@ -1,0 +1,32 @@
+// Reading the octets of keys, lengths, tags and values, where a short read or
+// a failed skip is a parse error of the stream.
+#ifndef ZELTA_KLV_STREAM_INPUT_H
+#define ZELTA_KLV_STREAM_INPUT_H
+
+#include <cstdint>
+#include <istream>
+
+#include "klv.h"
+
+namespace zelta::klv {
+
+// Exactly n octets ("unsuccessful read()").
+void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n);
+// A big-endian number of 1 to 8 octets.
+std::uint64_t readBigEndian(std::istream& stream, unsigned octets);
+// A key of 16 octets.
+KLVKey readKey(std::istream& stream);
+
+// Delivers a value that the handler took: into its buffer with one read and
+// one value event, else in chunks from a buffer of our own.
+void takeValue(std::istream& stream, KLVHandler& handler, std::uint64_t length, std::uint8_t* buffer);
+// Passes over a declined value: by relative seek when the stream can seek,
+// else by ignore().
+void skipValue(std::istream& stream, std::uint64_t length, bool seekable);
+// takeValue when taken, else skipValue.
+void transferValue(std::istream& stream, KLVHandler& handler, bool taken, std::uint64_t length, std::uint8_t* buffer,
+                   bool seekable);
+
+}  // namespace zelta::klv
+
+#endif
