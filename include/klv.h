@@ -1092,4 +1092,10 @@ private:
 // limit); false at the end of the stream or past the limit.
 bool findKey(std::istream& stream, std::streamoff limit);
 
+// ---------------------------------------------------------------------------
+// Timecode
+
+// ---------------------------------------------------------------------------
+// File device
+
 #endif
