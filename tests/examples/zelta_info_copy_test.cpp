@@ -14,7 +14,7 @@ TEST(ZeltaInfoCopy, CopyOfAFileFromEachWriterIsByteForByteTheSame) {
   for (const char* name : {"ffmpeg_h264_high_longgop_1080p25_2mono.mxf", "gst_dv25_625_420_2mono.mxf",
                            "bmx_op1a_dv25_625_bodypart_part4.mxf"}) {
     SCOPED_TRACE(name);
-    const std::string out = ::testing::TempDir() + "zelta-info-copy.mxf";
+    const std::string out = ::testing::TempDir() + "zelta-info-copy-same.mxf";
     zelta_test::ProgramRun run = zelta_test::runZeltaInfo("--copy " + out + " " + zelta_test::dataPath(name));
     EXPECT_EQ(run.status, 0) << run.err;
     EXPECT_EQ(zelta_test::readFile(out), zelta_test::readFile(zelta_test::dataPath(name)));
@@ -23,7 +23,7 @@ TEST(ZeltaInfoCopy, CopyOfAFileFromEachWriterIsByteForByteTheSame) {
 }
 
 TEST(ZeltaInfoCopy, RefusedFileEndsWithTheFatalReportAndExitOne) {
-  const std::string out = ::testing::TempDir() + "zelta-info-copy.mxf";
+  const std::string out = ::testing::TempDir() + "zelta-info-copy-refused.mxf";
   zelta_test::ProgramRun run =
       zelta_test::runZeltaInfo("--copy " + out + " " + zelta_test::dataPath("bmx_avid_opatom_dv25_625_v1.mxf"));
   EXPECT_EQ(run.status, 1);
