@@ -5,7 +5,6 @@
 #include <gtest/gtest.h>
 
 #include <cctype>
-#include <regex>
 #include <string>
 #include <vector>
 
@@ -88,11 +87,12 @@ const std::vector<ExpectedFile> expectedFiles = {
       {858624, "footer", 4, 3, 512, 858624, 0, 858624, 0, 0, 0, 0, 0}},
      {}}};
 
+// The number after "name": in a JSON object of zelta-info.
 long long field(const std::string& object, const std::string& name) {
-  std::smatch m;
-  std::regex re("\"" + name + "\": (-?[0-9]+)");
-  if (!std::regex_search(object, m, re)) return -12345;
-  return std::stoll(m[1]);
+  const std::string label = "\"" + name + "\": ";
+  std::string::size_type at = object.find(label);
+  if (at == std::string::npos) return -12345;
+  return std::stoll(object.substr(at + label.size()));
 }
 
 std::vector<std::string> partitionObjects(const std::string& json) {
@@ -128,11 +128,8 @@ void expectPartitions(const ExpectedFile& file, const std::string& json) {
     EXPECT_EQ(field(o, "bodyOffset"), e.bodyOffset);
     EXPECT_EQ(field(o, "bodySID"), e.bodySID);
     // The sections take exactly the octets that the pack promises them.
-    std::smatch m;
-    ASSERT_TRUE(std::regex_search(o, m, std::regex("\"metadata\": \\{\"elements\": [0-9]+, \"bytes\": ([0-9]+)\\}")));
-    EXPECT_EQ(std::stoll(m[1]), e.headerByteCount);
-    ASSERT_TRUE(std::regex_search(o, m, std::regex("\"index\": \\{\"elements\": [0-9]+, \"bytes\": ([0-9]+)\\}")));
-    EXPECT_EQ(std::stoll(m[1]), e.indexByteCount);
+    EXPECT_EQ(field(o.substr(o.find("\"metadata\": ")), "bytes"), e.headerByteCount);
+    EXPECT_EQ(field(o.substr(o.find("\"index\": ")), "bytes"), e.indexByteCount);
   }
 }
 
