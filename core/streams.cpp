@@ -22,8 +22,10 @@ vector_streambuf::pos_type vector_streambuf::seekoff(off_type off, std::ios_base
     base = gptr() - eback();
   else if (dir == std::ios_base::end)
     base = egptr() - eback();
-  off_type target = base + off;
-  if (target < 0 || target > egptr() - eback()) return failed;
+  // Offsets come from files: compare before adding, so no sum can overflow.
+  const off_type size = egptr() - eback();
+  if (off < -base || off > size - base) return failed;
+  const off_type target = base + off;
   setg(eback(), eback() + target, egptr());
   return pos_type(target);
 }

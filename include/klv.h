@@ -2,6 +2,7 @@
 #ifndef ZELTA_KLV_H
 #define ZELTA_KLV_H
 
+#include <algorithm>
 #include <array>
 #include <cstddef>
 #include <cstdint>
@@ -462,7 +463,10 @@ void internalize(std::istream& in, std::vector<T>& items) {
   internalize(in, itemSize);
   items.clear();
   if (count == 0) return;
-  items.reserve(count);
+  // The count comes from the octets: reserve no more than they can hold.
+  const std::streamsize available = in.rdbuf() ? in.rdbuf()->in_avail() : 0;
+  if (available > 0 && itemSize > 0)
+    items.reserve(std::min<std::uint64_t>(count, static_cast<std::uint64_t>(available) / itemSize));
   for (std::uint32_t i = 0; i < count; ++i) {
     std::streampos start = in.tellg();
     T item;
@@ -1094,8 +1098,154 @@ bool findKey(std::istream& stream, std::streamoff limit);
 
 // ---------------------------------------------------------------------------
 // Timecode
+//
+// A count is the number of units from 00:00:00:00; a unit is a frame, or a
+// field when a frame counts two units. Failures are std::runtime_error, and
+// std::logic_error for the guard of normalize.
+
+class TimecodeCalculator {
+public:
+  virtual ~TimecodeCalculator();
+  // The field output is skipped when null.
+  virtual void toTimecode(std::uint32_t count, std::uint8_t& hours, std::uint8_t& minutes, std::uint8_t& seconds,
+                          std::uint8_t& frames, std::uint8_t* field = nullptr) const = 0;
+  virtual std::uint32_t toCount(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+                                std::uint8_t field) const = 0;
+  virtual bool isValid(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+                       std::uint8_t field) const = 0;
+  virtual bool isInRange(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+                         std::uint8_t field) const = 0;
+  // The count wrapped into one day.
+  virtual std::uint32_t normalize(std::int32_t count) const = 0;
+  virtual std::uint32_t getCountPerDay() const = 0;
+};
+
+// Every frame number exists. unitsPerFrame 0 means 1.
+class RegularTimecodeCalculator : public TimecodeCalculator {
+public:
+  RegularTimecodeCalculator(std::uint8_t rate, std::uint8_t unitsPerFrame);
+
+  void toTimecode(std::uint32_t count, std::uint8_t& hours, std::uint8_t& minutes, std::uint8_t& seconds,
+                  std::uint8_t& frames, std::uint8_t* field = nullptr) const override;
+  std::uint32_t toCount(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+                        std::uint8_t field) const override;
+  bool isValid(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+               std::uint8_t field) const override;
+  bool isInRange(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+                 std::uint8_t field) const override;
+  std::uint32_t normalize(std::int32_t count) const override;
+  std::uint32_t getCountPerDay() const override;
+
+private:
+  std::uint32_t unitsPerFrame_;
+  std::uint32_t framesPerSecond_;
+  std::uint32_t framesPerMinute_;
+  std::uint32_t framesPerHour_;
+  std::uint32_t framesPerDay_;
+};
+
+// NTSC drop frame counting: the first d frame numbers of every minute but
+// each tenth do not exist, d being 2 at base 30 and 4 at base 60.
+class NTSCDropFrameCalculator : public TimecodeCalculator {
+public:
+  NTSCDropFrameCalculator(std::uint8_t rate, std::uint8_t unitsPerFrame);
+
+  void toTimecode(std::uint32_t count, std::uint8_t& hours, std::uint8_t& minutes, std::uint8_t& seconds,
+                  std::uint8_t& frames, std::uint8_t* field = nullptr) const override;
+  // Checks the range only: a dropped number moves up to the next one that
+  // exists.
+  std::uint32_t toCount(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+                        std::uint8_t field) const override;
+  bool isValid(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+               std::uint8_t field) const override;
+  bool isInRange(std::uint8_t hours, std::uint8_t minutes, std::uint8_t seconds, std::uint8_t frames,
+                 std::uint8_t field) const override;
+  std::uint32_t normalize(std::int32_t count) const override;
+  std::uint32_t getCountPerDay() const override;
+
+private:
+  std::uint32_t unitsPerFrame_;
+  std::uint32_t droppedPerMinute_;
+  std::uint32_t framesPerSecond_;
+  std::uint32_t framesPerMinute_;
+  std::uint32_t framesPerTenMinutes_;
+  std::uint32_t framesPerDay_;
+};
+
+// The caller owns the result. Drop frame needs a multiple of 30 ("valid drop
+// frame rate"); unitsPerFrame 0 means 1.
+TimecodeCalculator* createTimecodeCalculator(std::uint8_t rate, bool dropFrame, std::uint8_t unitsPerFrame);
+// Two units a frame when fieldCounting is true.
+TimecodeCalculator* createTimecodeCalculator(std::uint8_t rate, bool dropFrame, bool fieldCounting);
+// A rational frame rate: only multiples of 30000/1001 drop frames.
+TimecodeCalculator* createTimecodeCalculator(int numerator, int denominator);
 
 // ---------------------------------------------------------------------------
 // File device
+
+namespace zelta {
+
+// A large-file device for Boost.Iostreams streams: 64-bit positions, a read
+// size suited to the storage and read-ahead hints. Copies share one open
+// file. Every failure is a std::ios_base::failure whose what() is the bare
+// text ("not open", "bad read", ...).
+class file_device {
+public:
+  typedef char char_type;
+  struct category : boost::iostreams::seekable_device_tag,
+                    boost::iostreams::closable_tag,
+                    boost::iostreams::optimally_buffered_tag {};
+
+  // Hint bits. Only hint_limited_read and the bits above 128 may change
+  // after open.
+  static constexpr int hint_limited_read = 1;  // a read asks for 512 octets, not 1048576
+  static constexpr int hint_unbuffered = 2;    // aligned reads, and no reuse advised
+  static constexpr int hint_sequential = 4;
+  static constexpr int hint_random = 8;
+
+  struct impl;
+
+  file_device();
+  explicit file_device(const std::string& path, std::ios_base::openmode mode = std::ios_base::in | std::ios_base::out,
+                       int hints = 0);
+  explicit file_device(const std::wstring& path, std::ios_base::openmode mode = std::ios_base::in | std::ios_base::out,
+                       int hints = 0);
+
+  // The device keeps the new file only when opening succeeded.
+  void open(const std::string& path, std::ios_base::openmode mode = std::ios_base::in | std::ios_base::out,
+            int hints = 0);
+  void open(const std::wstring& path, std::ios_base::openmode mode = std::ios_base::in | std::ios_base::out,
+            int hints = 0);
+  // A stretch of a file: not implemented, so it always fails after the file
+  // has opened ("partial mode not implemented").
+  void open(boost::iostreams::stream_offset offset, boost::iostreams::stream_offset length, const std::string& path,
+            std::ios_base::openmode mode = std::ios_base::in | std::ios_base::out, int hints = 0);
+  void open(boost::iostreams::stream_offset offset, boost::iostreams::stream_offset length, const std::wstring& path,
+            std::ios_base::openmode mode = std::ios_base::in | std::ios_base::out, int hints = 0);
+  bool is_open() const;
+  void close();
+
+  // -1 at the end of the file.
+  std::streamsize read(char_type* s, std::streamsize n);
+  std::streamsize write(const char_type* s, std::streamsize n);
+  // Moves the logical position only; the end is size().
+  std::streampos seek(boost::iostreams::stream_offset off, std::ios_base::seekdir way);
+  // The largest position written for a write-only file, else the file's size.
+  boost::iostreams::stream_offset size() const;
+  // Cuts the file at the logical position.
+  void truncate();
+
+  std::streamsize optimal_buffer_size() const;
+  int hints() const;
+  void hints(int value);
+  void hints(int value, int mask);
+
+private:
+  impl& opened() const;
+
+  std::shared_ptr<impl> impl_;
+};
+
+}  // namespace zelta
 
 #endif

@@ -3,7 +3,9 @@
 #define ZELTA_MXF_H
 
 #include <cstdint>
+#include <map>
 #include <memory>
+#include <string>
 #include <vector>
 
 #include "klv.h"
@@ -16,6 +18,12 @@ inline constexpr MXFUID indexByteCountKagId = ZeltaErrorId(0x4C, 0x4C, 0x00, 0x0
 inline constexpr MXFUID randomIndexValueId = ZeltaErrorId(0x4C, 0x4C, 0x00, 0x06);
 inline constexpr MXFUID partitionByteCountId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x01);
 inline constexpr MXFUID partitionValueId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x02);
+inline constexpr MXFUID partitionOrderId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x03);
+inline constexpr MXFUID thisPartitionId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x04);
+inline constexpr MXFUID previousPartitionId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x05);
+inline constexpr MXFUID footerPartitionId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x06);
+inline constexpr MXFUID indexSIDId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x07);
+inline constexpr MXFUID bodySIDId = ZeltaErrorId(0x4C, 0x4C, 0x01, 0x08);
 inline constexpr MXFUID partitionVersionErrorId = ZeltaErrorId(0x4C, 0x4C, 0x02, 0x01);
 inline constexpr MXFUID partitionVersionRangeId = ZeltaErrorId(0x4C, 0x4C, 0x02, 0x02);
 
@@ -163,10 +171,339 @@ private:
 // ---------------------------------------------------------------------------
 // Primer and primed sets
 
+inline constexpr MXFUID nonStandardCodingId = ZeltaErrorId(0x4C, 0x4C, 0x00, 0x07);
+inline constexpr MXFUID invalidPrimerValueId = ZeltaErrorId(0x4C, 0x4C, 0x03, 0x01);
+inline constexpr MXFUID nonStandardPrimerKeyId = ZeltaErrorId(0x4C, 0x4C, 0x03, 0x02);
+inline constexpr MXFUID nonStandardPrimerTagId = ZeltaErrorId(0x4C, 0x4C, 0x03, 0x03);
+inline constexpr MXFUID inconsistentPrimerKeyId = ZeltaErrorId(0x4C, 0x4C, 0x03, 0x04);
+inline constexpr MXFUID inconsistentPrimerTagId = ZeltaErrorId(0x4C, 0x4C, 0x03, 0x05);
+inline constexpr MXFUID repeatedPropertyId = ZeltaErrorId(0x4C, 0x4C, 0x04, 0x01);
+inline constexpr MXFUID tagMissingInPrimerId = ZeltaErrorId(0x4C, 0x4C, 0x04, 0x02);
+
+inline constexpr KLVKey MXFPrimerPackKey{
+    std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x02, 0x05, 0x01, 0x01, 0x0D, 0x01, 0x02, 0x01, 0x01, 0x05,
+                                 0x01, 0x00}};
+inline constexpr KLVKey MXFPrefaceKey{
+    std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x02, 0x53, 0x01, 0x01, 0x0D, 0x01, 0x01, 0x01, 0x01, 0x01,
+                                 0x2F, 0x00}};
+inline constexpr KLVKey MXFPrefaceVersionKey{
+    std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, 0x02, 0x03, 0x01, 0x02, 0x01, 0x05, 0x00,
+                                 0x00, 0x00}};
+// An in-memory property: the keys, in order, that a set's items are to be
+// written in before the rest.
+inline constexpr KLVKey MXFPropertyOrderHintKey{
+    std::array<std::uint8_t, 16>{0x9C, 0xEF, 0x38, 0xE7, 0xD8, 0x04, 0x25, 0xC1, 0xC3, 0xD2, 0x00, 0x01, 0x9C, 0xAD,
+                                 0x11, 0xE0}};
+// Keys that exist in memory only and are never written or primed; octets
+// 10 and 11 tell them apart.
+inline constexpr KLVKeyPattern MXFPrivatePropertyPattern =
+    KLVKeyPattern(std::array<std::uint8_t, 16>{0x9C, 0xEF, 0x38, 0xE7, 0xD8, 0x04, 0x25, 0x00, 0xC3, 0xD2, 0x00, 0x00,
+                                               0x9C, 0xAD, 0x11, 0xE0});
+
+struct MXFPrimerEntry {
+  std::uint16_t tag = 0;
+  KLVKey key;
+
+  bool operator==(const MXFPrimerEntry& o) const { return tag == o.tag && key == o.key; }
+  bool operator!=(const MXFPrimerEntry& o) const { return !(*this == o); }
+};
+
+typedef std::vector<MXFPrimerEntry> MXFPrimerEntries;
+typedef std::map<std::uint16_t, KLVKey> MXFTagToKeyMap;
+typedef std::map<KLVKey, std::uint16_t> MXFKeyToTagMap;
+
+// A local set with its tags resolved: the set key as found and its
+// properties by full key. Where an item stood in the file is not kept.
+struct MXFPrimedSet {
+  KLVKey key;
+  std::map<KLVKey, ByteVector> properties;
+
+  bool operator==(const MXFPrimedSet& o) const { return key == o.key && properties == o.properties; }
+  bool operator!=(const MXFPrimedSet& o) const { return !(*this == o); }
+};
+
+// The primer that every file of the format may rely on: the static tags of
+// the format classes and the index table segment, in three forms.
+const MXFPrimerEntries& getMXFStandardPrimer();
+const MXFTagToKeyMap& getMXFStandardPrimerKeys();  // tag to key
+const MXFKeyToTagMap& getMXFStandardPrimerTags();  // key to tag
+
+class MXFMetadataHandler {
+public:
+  virtual ~MXFMetadataHandler();
+  virtual void start() = 0;
+  virtual void end() = 0;
+  // The primer, in file order.
+  virtual void primer(const MXFPrimerEntries& entries) = 0;
+  // Whether the handler wants the properties of a set of this key.
+  virtual bool acceptSet(const KLVKey& key) = 0;
+  virtual void primedSet(const MXFPrimedSet& set) = 0;
+};
+
+// Turns the local sets with two-octet tags of a KLV stream into primed sets
+// by a primer that a subclass supplies. Sets of other tag sizes, and sets
+// that acceptSet declines, are skipped.
+class MXFPrimedSetParser : public DullKLVHandler {
+public:
+  MXFPrimedSetParser();
+  MXFPrimedSetParser(const MXFPrimedSetParser&) = delete;
+  MXFPrimedSetParser& operator=(const MXFPrimedSetParser&) = delete;
+
+  virtual void setErrorHandler(ErrorHandler* errorHandler);
+  virtual const MXFTagToKeyMap& getPrimer() = 0;
+  virtual bool acceptSet(const KLVKey& key) = 0;
+  virtual void primedSet(const MXFPrimedSet& set) = 0;
+
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+protected:
+  enum State { idle, beforePrimer, inPrimer, betweenSets, inSet };
+
+  State getState() const { return state_; }
+  void setState(State state) { state_ = state; }
+  ErrorHandler* getErrorHandler() const { return errorHandler_; }
+  // Reports vanish when no error handler is set.
+  void reportWarning(const MXFUID& identifier, const std::string& message);
+  void reportError(const MXFUID& identifier, const std::string& message);
+
+private:
+  State state_ = idle;
+  ErrorHandler* errorHandler_ = nullptr;
+  MXFPrimedSet set_;
+  bool wanted_ = false;
+  std::map<KLVKey, ByteVector>::iterator property_;
+};
+
+// The header metadata of one partition as primer and primed sets, with the
+// primer checked against the standard primer.
+class MXFMetadataParser : public MXFPrimedSetParser {
+public:
+  explicit MXFMetadataParser(MXFMetadataHandler* handler);
+
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  void value(const std::uint8_t* data, std::streamsize size) override;
+
+  const MXFTagToKeyMap& getPrimer() override;
+  bool acceptSet(const KLVKey& key) override;
+  void primedSet(const MXFPrimedSet& set) override;
+
+private:
+  MXFMetadataHandler* handler_;
+  ByteVector primerBytes_;
+  MXFTagToKeyMap keys_;
+  std::uint8_t lastForm_ = KLVNoLengthForm;
+  bool formChanged_ = false;
+  std::uint64_t largestItem_ = 0;
+  KLVLengthType lengthType_ = KLVLengthTypeBER;
+};
+
+// Writes primer and primed sets as header metadata into a KLV handler, all
+// lengths in the four-octet form. From version 1.3 on, the Preface starts at
+// a multiple of 512 octets from the start of the stream.
+class MXFMetadataCoder : public MXFMetadataHandler {
+public:
+  explicit MXFMetadataCoder(KLVHandler* handler);
+  MXFMetadataCoder(const MXFMetadataCoder&) = delete;
+  MXFMetadataCoder& operator=(const MXFMetadataCoder&) = delete;
+
+  void start() override;
+  void end() override;
+  void primer(const MXFPrimerEntries& entries) override;
+  bool acceptSet(const KLVKey& key) override;
+  void primedSet(const MXFPrimedSet& set) override;
+
+private:
+  enum State { idle, started, primerWritten };
+
+  void enterPrimer(const MXFPrimerEntries& entries);
+  void alignPreface(const MXFPrimedSet& set);
+  void codeSet(const MXFPrimedSet& set);
+
+  KLVMonitor monitor_;
+  KLVFiller filler_;
+  State state_ = idle;
+  MXFKeyToTagMap tags_;
+};
+
+// Writes the standard primer ahead of the given entries.
+class MXFFormatMetadataCoder : public MXFMetadataCoder {
+public:
+  using MXFMetadataCoder::MXFMetadataCoder;
+  void primer(const MXFPrimerEntries& entries) override;
+};
+
+// Adds the index table segment's tags that the entries lack, so that the
+// segments after the metadata are served by the same primer.
+class MXFMetadataPlusIndexPrimerCoder : public MXFMetadataCoder {
+public:
+  using MXFMetadataCoder::MXFMetadataCoder;
+  void primer(const MXFPrimerEntries& entries) override;
+};
+
 // ---------------------------------------------------------------------------
 // Structure coding and validation
 
+// Writes partition packs and the random index, and fills in the offsets that
+// only the place in the file decides. What the validator reports, the coder
+// refuses by assertion.
+class MXFStructureCoder : public MXFStructureHandler {
+public:
+  // The padders are shared with the writers of header metadata and index
+  // tables: each partition arms them with its byte counts, so that what
+  // passes through them fills exactly the space that the pack promised.
+  MXFStructureCoder(KLVHandler* handler, Locator* locator, KLVStreamPadder* headerPadder,
+                    KLVStreamPadder* indexPadder);
+  MXFStructureCoder(const MXFStructureCoder&) = delete;
+  MXFStructureCoder& operator=(const MXFStructureCoder&) = delete;
+
+  void setRunIn(std::uint32_t runIn) override;
+  void startStream() override;
+  void endStream(bool aborted) override;
+  // packLength is what the pack and its fill are to take; 0 aligns them on
+  // the KAG.
+  void startPartition(const KLVKey& key, const MXFPartitionPack& pack, std::uint64_t packLength) override;
+  void endPartition(const KLVKey& key) override;
+  // Writes the coder's own list of partitions; the entries given are ignored.
+  void randomIndex(const std::vector<MXFRandomIndexEntry>& entries) override;
+
+  // A partition that is already in the file joins the list without being
+  // written.
+  virtual void addPartition(const MXFPartitionPack& pack);
+
+private:
+  KLVFiller filler_;
+  Locator* locator_;
+  KLVStreamPadder* headerPadder_;
+  KLVStreamPadder* indexPadder_;
+  std::vector<MXFRandomIndexEntry> partitions_;
+};
+
+// Reports what is wrong with the partition structure of a file being read,
+// and passes every event on.
+class MXFStructureValidator : public MXFStructureHandler {
+public:
+  explicit MXFStructureValidator(MXFStructureHandler* handler);
+  ~MXFStructureValidator() override;
+  MXFStructureValidator(const MXFStructureValidator&) = delete;
+  MXFStructureValidator& operator=(const MXFStructureValidator&) = delete;
+
+  void setRunIn(std::uint32_t runIn) override;
+  void startStream() override;
+  void endStream(bool aborted) override;
+  void startPartition(const KLVKey& key, const MXFPartitionPack& pack, std::uint64_t packLength) override;
+  void endPartition(const KLVKey& key) override;
+  void randomIndex(const std::vector<MXFRandomIndexEntry>& entries) override;
+
+  // Both optional: without a locator the offset checks are skipped.
+  virtual void setErrorHandler(ErrorHandler* errorHandler);
+  virtual void setLocator(Locator* locator);
+
+private:
+  class Impl;
+  std::unique_ptr<Impl> impl_;
+};
+
 // ---------------------------------------------------------------------------
 // Sequential reader
+
+// Reads a file from start to end into the four ports, with the structure
+// validated. Every handler is optional and none is owned.
+class MXFReader {
+public:
+  MXFReader();
+  virtual ~MXFReader();
+
+  virtual void setSkipRunIn(bool skipRunIn);
+  virtual void setStructureHandler(MXFStructureHandler* handler);
+  virtual void setMetadataHandler(KLVHandler* handler);
+  virtual void setIndexHandler(KLVHandler* handler);
+  virtual void setEssenceHandler(KLVHandler* handler);
+  virtual void setErrorHandler(ErrorHandler* errorHandler);
+  virtual void read(std::istream& stream);
+
+private:
+  bool skipRunIn_ = false;
+  MXFStructureHandler* structureHandler_ = nullptr;
+  KLVHandler* metadataHandler_ = nullptr;
+  KLVHandler* indexHandler_ = nullptr;
+  KLVHandler* essenceHandler_ = nullptr;
+  ErrorHandler* errorHandler_ = nullptr;
+};
+
+// Moves a stream to the first partition pack key behind a run-in.
+class MXFRunInSkipper {
+public:
+  MXFRunInSkipper();
+  virtual ~MXFRunInSkipper();
+
+  virtual void setErrorHandler(ErrorHandler* errorHandler);
+  // The run-in's length; a run-in longer than maximum is "invalid run-in".
+  virtual std::uint32_t skip(std::istream& stream, std::uint32_t maximum);
+
+private:
+  ErrorHandler* errorHandler_ = nullptr;
+};
+
+// Ends a read early, by exception: before the first element at or behind a
+// stop position (StopPosition), or at the next partition pack
+// (EndPartition). The handler behind it sees a clean end of stream.
+class MXFPartitionFilter : public DullKLVFilter {
+public:
+  class exception {};
+  class StopPosition : public exception {};
+  class EndPartition : public exception {};
+
+  // A stop position of -1 is none.
+  MXFPartitionFilter(KLVHandler* handler, std::streamoff stopPosition);
+
+  // Where the last element ended, or the stream started.
+  std::streamoff getLastPosition() const;
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endIndividualItem(const KLVKey& key) override;
+  bool startLabel(const KLVKey& key) override;
+  void endLabel(const KLVKey& key) override;
+  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
+  void endUniversalSet(const KLVKey& key) override;
+  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                     KLVLengthType lengthType) override;
+  void endLocalSet(const KLVKey& key) override;
+  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
+  void endFixedLengthPack(const KLVKey& key) override;
+  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
+  void endVariableLengthPack(const KLVKey& key) override;
+  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
+  void endWrapper(const KLVKey& key) override;
+
+private:
+  void stopIfReached();
+  void refresh();
+
+  Locator* locator_ = nullptr;
+  std::streamoff stopPosition_;
+  std::streamoff lastPosition_ = -1;
+  bool started_ = false;
+};
+
+// ---------------------------------------------------------------------------
+// Index tables
+
+// ---------------------------------------------------------------------------
+// Writer and multiplexer
 
 #endif

@@ -20,13 +20,16 @@ constexpr std::uint64_t largestReservation = 65536;
 
 MXFSplitter::Impl::Impl(MXFStructureHandler* structureHandler, KLVHandler* metadataHandler,
                         KLVHandler* indexHandler, KLVHandler* essenceHandler, bool validate)
-    : structureHandler_(structureHandler),
+    : validator_(validate ? new MXFStructureValidator(structureHandler) : nullptr),
+      structureHandler_(validate ? validator_.get() : structureHandler),
       metadataHandler_(metadataHandler),
       indexHandler_(indexHandler),
-      essenceHandler_(essenceHandler),
-      validate_(validate) {}
+      essenceHandler_(essenceHandler) {}
 
-void MXFSplitter::Impl::setErrorHandler(ErrorHandler* errorHandler) { errorHandler_ = errorHandler; }
+void MXFSplitter::Impl::setErrorHandler(ErrorHandler* errorHandler) {
+  errorHandler_ = errorHandler;
+  if (validator_) validator_->setErrorHandler(errorHandler);
+}
 
 void MXFSplitter::Impl::setRunIn(std::uint32_t runIn) {
   check(state_ == idle, "before start");
@@ -143,6 +146,7 @@ void MXFSplitter::Impl::startStream(bool hasAccurateLengths) {
   check(hasAccurateLengths, "has accurate lengths");
   check(upstream_ != nullptr, "has locator");
   storePosition();
+  if (validator_) validator_->setLocator(&locator_);
   delegateStarted_ = false;
   inPartition_ = false;
   state_ = started;

@@ -2,6 +2,7 @@
 #ifndef ZELTA_MXF_SPLITTER_IMPL_H
 #define ZELTA_MXF_SPLITTER_IMPL_H
 
+#include <memory>
 #include <string>
 
 #include "mxf.h"
@@ -72,12 +73,13 @@ private:
   [[noreturn]] void fatal(const MXFUID& identifier, const std::string& message);
   [[noreturn]] void fatal(const MXFUID& identifier, const char* text, const KLVKey& key);
 
+  // In front of the client's structure handler when validating.
+  std::unique_ptr<MXFStructureValidator> validator_;
+  // The head of the structure chain: the validator or the client's handler.
   MXFStructureHandler* structureHandler_;
   KLVHandler* metadataHandler_;
   KLVHandler* indexHandler_;
   KLVHandler* essenceHandler_;
-  // Whether structure checks are asked for in front of the structure handler.
-  [[maybe_unused]] bool validate_;
   ErrorHandler* errorHandler_ = nullptr;
   Locator* upstream_ = nullptr;
   std::uint8_t currentForm_ = KLVNoLengthForm;

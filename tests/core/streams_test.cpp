@@ -2,6 +2,7 @@
 
 #include <ios>
 #include <istream>
+#include <limits>
 #include <sstream>
 #include <string>
 
@@ -41,6 +42,21 @@ TEST(VectorStreambuf, SeekOutsideTheVectorAnswersMinusOne) {
   EXPECT_EQ(seekOff(buffer, 1, std::ios_base::end), -1);
   EXPECT_EQ(static_cast<std::streamoff>(buffer.pubseekpos(9, std::ios_base::in)), -1);
   EXPECT_EQ(buffer.sgetc(), 0x01);
+}
+
+// Found by the fuzzer: a skip of almost 2^63 octets from the middle of a
+// value once overflowed the sum of position and offset.
+TEST(VectorStreambuf, OffsetsAtTheLimitsOfTheTypeAnswerMinusOne) {
+  ByteVector bytes = bytesOf("01 02 03 04");
+  util::vector_streambuf buffer(bytes);
+  const std::streamoff largest = std::numeric_limits<std::streamoff>::max();
+  const std::streamoff smallest = std::numeric_limits<std::streamoff>::min();
+  EXPECT_EQ(seekOff(buffer, 2, std::ios_base::beg), 2);
+  EXPECT_EQ(seekOff(buffer, largest, std::ios_base::cur), -1);
+  EXPECT_EQ(seekOff(buffer, smallest, std::ios_base::cur), -1);
+  EXPECT_EQ(seekOff(buffer, largest, std::ios_base::end), -1);
+  EXPECT_EQ(seekOff(buffer, smallest, std::ios_base::end), -1);
+  EXPECT_EQ(buffer.sgetc(), 0x03);
 }
 
 TEST(VectorStreambuf, OffsetFromEndCountsBack) {

@@ -1,0 +1,146 @@
+// zelta-info: the partitions, sections, header metadata and random index of
+// an MXF file, as the library's readers see them.
+
+#include <cstring>
+#include <fstream>
+#include <iostream>
+#include <string>
+
+#include "summary.h"
+
+namespace {
+
+using namespace zelta_info;
+
+const char* const usage =
+    "usage: zelta-info [--json] [--sets] FILE\n"
+    "       zelta-info --copy OUT FILE\n"
+    "\n"
+    "Reads the MXF file FILE (a run-in is skipped) and prints each partition\n"
+    "(kind, status and pack fields), the elements and bytes of its header\n"
+    "metadata, index and essence sections, and the random index. Reports of\n"
+    "the read, the structure checks among them, go to stderr as 'warning: ',\n"
+    "'error: ' or 'fatal: ' and the message.\n"
+    "\n"
+    "  --json   print one JSON object instead (file, result, runIn, partitions,\n"
+    "           randomIndex, metadata with --sets, reports)\n"
+    "  --sets   also print the primer and the primed sets (set key, property\n"
+    "           keys and sizes) of each partition's header metadata\n"
+    "  --copy OUT\n"
+    "           copy FILE to OUT element by element, through the KLV reader\n"
+    "           and writer\n"
+    "  --help   print this text\n"
+    "\n"
+    "Exit status: 0 when the read ended normally, 1 when a fatal error stopped\n"
+    "it, 2 on a usage error (no file, unreadable file).\n";
+
+struct Options {
+  bool json = false;
+  bool sets = false;
+  std::string file;
+  std::string copyTo;
+};
+
+// Reads the whole file; false when a fatal error stopped the read.
+bool readFile(std::istream& in, Summary& summary, bool sets) {
+  Reporter reporter(summary);
+  SetCollector setCollector(summary);
+  MXFMetadataParser setParser(&setCollector);
+  setParser.setErrorHandler(&reporter);
+  DullKLVHandler skipper;
+  SectionCounter metadata(summary, metadataSection, sets ? static_cast<KLVHandler*>(&setParser) : &skipper);
+  SectionCounter index(summary, indexSection, &skipper);
+  SectionCounter essence(summary, essenceSection, &skipper);
+  StructureCollector structure(summary);
+  MXFReader reader;
+  reader.setSkipRunIn(true);
+  reader.setStructureHandler(&structure);
+  reader.setMetadataHandler(&metadata);
+  reader.setIndexHandler(&index);
+  reader.setEssenceHandler(&essence);
+  reader.setErrorHandler(&reporter);
+  try {
+    reader.read(in);
+    return true;
+  } catch (const std::exception& e) {
+    // Fatal reports reach the error handler before they are thrown; anything
+    // else is a fault that no report has named yet.
+    if (summary.reports.empty() || summary.reports.back().severity != "fatal" ||
+        summary.reports.back().message != e.what())
+      reporter.fatalError(MXFUID(), e.what());
+    return false;
+  }
+}
+
+// Copies element by element; false when a fatal error stopped the read.
+bool copyFile(std::istream& in, const std::string& outName) {
+  std::ofstream out(outName, std::ios::binary | std::ios::trunc);
+  if (!out) {
+    std::cerr << "zelta-info: cannot write " << outName << "\n";
+    return false;
+  }
+  Summary summary;
+  Reporter reporter(summary);
+  GenericKLVWriter writer(out);
+  GenericKLVReader reader;
+  reader.setHandler(&writer);
+  reader.setErrorHandler(&reporter);
+  try {
+    reader.read(in);
+  } catch (const std::exception& e) {
+    if (summary.reports.empty()) std::cerr << "fatal: " << e.what() << "\n";
+    return false;
+  }
+  out.close();
+  if (!out) {
+    std::cerr << "zelta-info: cannot write " << outName << "\n";
+    return false;
+  }
+  return true;
+}
+
+// False on a usage error.
+bool parseOptions(int argc, char** argv, Options& options) {
+  for (int i = 1; i < argc; ++i) {
+    if (std::strcmp(argv[i], "--json") == 0) {
+      options.json = true;
+    } else if (std::strcmp(argv[i], "--sets") == 0) {
+      options.sets = true;
+    } else if (std::strcmp(argv[i], "--copy") == 0 && i + 1 < argc) {
+      options.copyTo = argv[++i];
+    } else if (argv[i][0] == '-' || !options.file.empty()) {
+      return false;
+    } else {
+      options.file = argv[i];
+    }
+  }
+  return !options.file.empty();
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  for (int i = 1; i < argc; ++i)
+    if (std::strcmp(argv[i], "--help") == 0) {
+      std::cout << usage;
+      return 0;
+    }
+  Options options;
+  if (!parseOptions(argc, argv, options)) {
+    std::cerr << usage;
+    return 2;
+  }
+  std::ifstream in(options.file, std::ios::binary);
+  if (!in) {
+    std::cerr << "zelta-info: cannot open " << options.file << "\n";
+    return 2;
+  }
+  if (!options.copyTo.empty()) return copyFile(in, options.copyTo) ? 0 : 1;
+  Summary summary;
+  bool ok = readFile(in, summary, options.sets);
+  if (options.json)
+    printJson(std::cout, options.file, !ok, summary, options.sets);
+  else
+    printText(std::cout, summary, options.sets);
+  return ok ? 0 : 1;
+}

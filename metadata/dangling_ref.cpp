@@ -1,0 +1,3 @@
+#include "metadata.h"
+
+dangling_ref_base::~dangling_ref_base() = default;

@@ -1,0 +1,101 @@
+#include <algorithm>
+
+#include "klv/messages.h"
+#include "mxf.h"
+#include "mxf/primer.h"
+
+namespace {
+
+// The form that the format asks of every length in header metadata.
+constexpr std::uint8_t standardForm = 0x83;
+// An item that needs more than two length octets justifies BER item lengths.
+constexpr std::uint64_t twoOctetLengthLimit = 0x10000;
+
+}  // namespace
+
+MXFMetadataParser::MXFMetadataParser(MXFMetadataHandler* handler) : handler_(handler) {
+  check(handler != nullptr, "handler is present");
+}
+
+void MXFMetadataParser::startStream(bool) {
+  check(getState() == idle, "before start");
+  setState(beforePrimer);
+  primerBytes_.clear();
+  keys_.clear();
+  lastForm_ = KLVNoLengthForm;
+  formChanged_ = false;
+  handler_->start();
+}
+
+// The handler finishes with what it has, also after a failure.
+void MXFMetadataParser::endStream(bool) {
+  setState(idle);
+  handler_->end();
+}
+
+void MXFMetadataParser::setLengthForm(std::uint8_t form) {
+  lastForm_ = form;
+  formChanged_ = true;
+}
+
+bool MXFMetadataParser::startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
+                                      KLVLengthType lengthType) {
+  if (formChanged_ && lastForm_ != standardForm) {
+    formChanged_ = false;
+    reportWarning(nonStandardCodingId, zelta::klv::withOctet("non-standard BER length form", lastForm_));
+  }
+  largestItem_ = 0;
+  lengthType_ = lengthType;
+  if (lengthType != KLVLengthTypeBER && lengthType != KLVLengthType2)
+    reportWarning(nonStandardCodingId,
+                  std::string("non-standard local item length type - ") + KLVLengthTypeLabel(lengthType));
+  return MXFPrimedSetParser::startLocalSet(key, length, tagType, lengthType);
+}
+
+void MXFMetadataParser::endLocalSet(const KLVKey& key) {
+  if (lengthType_ == KLVLengthTypeBER && largestItem_ < twoOctetLengthLimit)
+    reportWarning(nonStandardCodingId,
+                  std::string("non-standard local item length type - ") + KLVLengthTypeLabel(KLVLengthTypeBER));
+  MXFPrimedSetParser::endLocalSet(key);
+}
+
+bool MXFMetadataParser::startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) {
+  largestItem_ = std::max(largestItem_, length);
+  return MXFPrimedSetParser::startLocalItem(tag, length, buffer);
+}
+
+// Only the first primer of the stream counts; any other pack is skipped.
+bool MXFMetadataParser::startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*&) {
+  if (getState() != beforePrimer || key != MXFPrimerPackKey) return false;
+  primerBytes_.reserve(std::min(length, zelta::mxf::largestReservation));
+  setState(inPrimer);
+  return true;
+}
+
+void MXFMetadataParser::endFixedLengthPack(const KLVKey& key) {
+  if (getState() != inPrimer || key != MXFPrimerPackKey) return;
+  MXFPrimerEntries entries;
+  try {
+    entries = zelta::mxf::decodePrimer(primerBytes_);
+  } catch (const util::assertion_failure& failure) {
+    reportError(invalidPrimerValueId, std::string("invalid primer value - ") + failure.what());
+    entries = getMXFStandardPrimer();
+  }
+  keys_ = zelta::mxf::verifyPrimer(entries, getErrorHandler());
+  setState(betweenSets);
+  handler_->primer(entries);
+}
+
+void MXFMetadataParser::value(const std::uint8_t* data, std::streamsize size) {
+  if (getState() == inPrimer) {
+    primerBytes_.insert(primerBytes_.end(), data, data + size);
+    return;
+  }
+  MXFPrimedSetParser::value(data, size);
+}
+
+const MXFTagToKeyMap& MXFMetadataParser::getPrimer() { return keys_; }
+
+bool MXFMetadataParser::acceptSet(const KLVKey& key) { return handler_->acceptSet(key); }
+
+void MXFMetadataParser::primedSet(const MXFPrimedSet& set) { handler_->primedSet(set); }

@@ -1,0 +1,3 @@
+#include "mxf.h"
+
+MXFMetadataHandler::~MXFMetadataHandler() = default;
