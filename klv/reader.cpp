@@ -5,18 +5,6 @@
 
 namespace {
 
-// A zero relative seek asks the buffer where it is without moving it; a
-// buffer that cannot answer is read as a pipe.
-bool isSeekable(std::istream& stream) {
-  std::streambuf* buffer = stream.rdbuf();
-  if (!buffer) return false;
-  try {
-    return buffer->pubseekoff(0, std::ios_base::cur, std::ios_base::in) != std::streampos(-1);
-  } catch (...) {
-    return false;
-  }
-}
-
 // The filter next to the reader, which also answers where the read is.
 struct PositionFilter {
   std::unique_ptr<KLVFilter> filter;
@@ -96,7 +84,7 @@ void GenericKLVReader::read(std::istream& stream, std::streampos stop) {
   KLVHandler* client = getHandler();
   if (!stream.good()) failBadStream(errorHandler_);
   KLVFillItemKeyFilter fillFilter(client, getFillItemKeyVersion(stream), errorHandler_);
-  const bool seekable = isSeekable(stream);
+  const bool seekable = zelta::klv::isSeekable(stream);
   PositionFilter position = makePositionFilter(stream, seekable, &fillFilter);
   if (errorHandler_) {
     errorHandler_->setLocator(position.locator);

@@ -33,6 +33,16 @@ void skipPiece(std::istream& stream, std::streamoff octets, bool seekable) {
 
 }  // namespace
 
+bool isSeekable(std::istream& stream) {
+  std::streambuf* buffer = stream.rdbuf();
+  if (!buffer) return false;
+  try {
+    return buffer->pubseekoff(0, std::ios_base::cur, std::ios_base::in) != std::streampos(-1);
+  } catch (...) {
+    return false;
+  }
+}
+
 void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n) {
   stream.read(reinterpret_cast<char*>(octets), n);
   if (stream.gcount() != n) throw KLVElement::parse_error(streamFailureId, "unsuccessful read()");

@@ -10,6 +10,10 @@
 
 namespace zelta::klv {
 
+// Whether the stream's buffer can tell where it is: a zero relative seek that
+// does not answer -1. A buffer that cannot is read as a pipe.
+bool isSeekable(std::istream& stream);
+
 // Exactly n octets ("unsuccessful read()").
 void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n);
 // A big-endian number of 1 to 8 octets.

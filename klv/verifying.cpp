@@ -120,18 +120,9 @@ namespace {
 constexpr std::uint8_t keyPrefix[4] = {0x06, 0x0E, 0x2B, 0x34};
 constexpr std::streamoff prefixOctets = 4;
 
-bool canSeek(std::istream& stream) {
-  std::streambuf* buffer = stream.rdbuf();
-  try {
-    return buffer && buffer->pubseekoff(0, std::ios_base::cur, std::ios_base::in) != std::streampos(-1);
-  } catch (...) {
-    return false;
-  }
-}
-
 // Back to the first octet of the prefix just read.
 void backUpOverPrefix(std::istream& stream) {
-  if (canSeek(stream)) {
+  if (zelta::klv::isSeekable(stream)) {
     stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
     stream.seekg(-prefixOctets, std::ios_base::cur);
     check(!stream.fail(), "successful seekg()");

@@ -2,6 +2,7 @@
 #include <stdexcept>
 #include <string>
 
+#include "klv/stream_input.h"
 #include "mxf.h"
 
 namespace {
@@ -10,15 +11,6 @@ namespace {
 // a run-in is matched more strictly than a key anywhere else.
 constexpr std::size_t targetOctets = 11;
 constexpr std::uint8_t target[targetOctets] = {0x06, 0x0E, 0x2B, 0x34, 0x02, 0x05, 0x01, 0x01, 0x0D, 0x01, 0x02};
-
-bool canSeek(std::istream& stream) {
-  std::streambuf* buffer = stream.rdbuf();
-  try {
-    return buffer && buffer->pubseekoff(0, std::ios_base::cur, std::ios_base::in) != std::streampos(-1);
-  } catch (...) {
-    return false;
-  }
-}
 
 }  // namespace
 
@@ -51,7 +43,7 @@ std::uint32_t MXFRunInSkipper::skip(std::istream& stream, std::uint32_t maximum)
     fatal(streamFailureId, "unsuccessful get()");
   }
   // The key goes back to the stream, for the KLV reader to find.
-  if (canSeek(stream)) {
+  if (zelta::klv::isSeekable(stream)) {
     stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
     stream.seekg(-static_cast<std::streamoff>(targetOctets), std::ios_base::cur);
     if (stream.fail()) fatal(streamFailureId, "unsuccessful seekg()");
