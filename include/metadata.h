@@ -3,13 +3,17 @@
 #define ZELTA_METADATA_H
 
 #include <cstddef>
+#include <list>
 #include <map>
 #include <memory>
 #include <optional>
+#include <string>
 #include <type_traits>
+#include <typeinfo>
 #include <variant>
 
 #include "klv.h"
+#include "mxf.h"
 
 // ---------------------------------------------------------------------------
 // Metadata objects
@@ -205,5 +209,192 @@ private:
 
 // ---------------------------------------------------------------------------
 // Factories and model coding
+//
+// Each class has a factory that turns a primed set into an object and back;
+// a composite factory finds the right one. The model parser connects the
+// objects that the sets make, in whatever order they come, and the model
+// coder walks the tree into a primer and primed sets.
+
+// Reports of the model family.
+inline constexpr MXFUID unrecognizedMetadataId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x01);
+inline constexpr MXFUID missingPropertyId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x02);
+inline constexpr MXFUID invalidPropertyValueId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x03);
+inline constexpr MXFUID duplicateInstanceUIDId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x04);
+inline constexpr MXFUID objectAlreadyOwnedId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x05);
+inline constexpr MXFUID invalidReferenceId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x06);
+inline constexpr MXFUID backwardStrongReferenceId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x07);
+inline constexpr MXFUID unreferencedObjectsId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x08);
+inline constexpr MXFUID danglingReferencesId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x09);
+inline constexpr MXFUID firstObjectNotRootId = ZeltaErrorId(0x4C, 0x4F, 0x00, 0x0A);
+
+inline constexpr KLVKey MXFInstanceUIDKey{
+    std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, 0x01, 0x01, 0x01, 0x15, 0x02, 0x00, 0x00,
+                                 0x00, 0x00}};
+// An in-memory property of the root: the instance identifiers of the sets
+// that are to be written last, in this order.
+inline constexpr KLVKey MXFPrimedSetOrderKey{
+    std::array<std::uint8_t, 16>{0x9C, 0xEF, 0x38, 0xE7, 0xD8, 0x04, 0x25, 0xC1, 0xC3, 0xD2, 0x00, 0x02, 0x9C, 0xAD,
+                                 0x11, 0xE0}};
+
+typedef std::map<KLVKey, ByteVector> MXFPropertyMap;
+// Pending references under the identifiers of their targets.
+typedef std::multimap<MXFUID, std::shared_ptr<dangling_ref_base>> MXFPendingReferences;
+// The objects that a set owns, in the order in which they were met.
+typedef std::list<std::shared_ptr<const MetadataRoot>> MXFReferencedObjects;
+typedef std::vector<std::shared_ptr<MetadataRoot>> MXFMetadataModel;
+
+struct MXFParsedObject {
+  std::shared_ptr<MetadataRoot> object;
+  MXFPendingReferences references;
+};
+
+struct MXFCodedObject {
+  MXFPrimedSet set;
+  MXFReferencedObjects referenced;
+};
+
+class MXFMetadataFactory {
+public:
+  virtual ~MXFMetadataFactory();
+  virtual void setErrorHandler(const std::shared_ptr<ErrorHandler>& errorHandler) = 0;
+  virtual bool canParse(const KLVKey& setKey) = 0;
+  virtual MXFParsedObject parse(const MXFPrimedSet& set) = 0;
+  virtual const std::type_info& getType(const KLVKey& setKey) = 0;
+  virtual bool canCode(const std::type_info& type) = 0;
+  virtual MXFCodedObject code(const std::shared_ptr<const MetadataRoot>& object) = 0;
+  virtual const MXFKeyToTagMap& getSetPrimer(const std::type_info& type) = 0;
+  virtual const KLVKey& getSetKey(const std::type_info& type) = 0;
+};
+
+// The factory of one class. A class's factory derives from its base class's
+// factory; each constructor adds its class's own properties to the set
+// primer, which thus holds the whole class chain. A tag of 0 there means
+// that the key gets a dynamic tag when coded.
+class MetadataRootFactory : public MXFMetadataFactory {
+public:
+  MetadataRootFactory();
+  ~MetadataRootFactory() override;
+
+  void setErrorHandler(const std::shared_ptr<ErrorHandler>& errorHandler) override;
+  bool canParse(const KLVKey& setKey) override;
+  MXFParsedObject parse(const MXFPrimedSet& set) override;
+  const std::type_info& getType(const KLVKey& setKey) override;
+  bool canCode(const std::type_info& type) override;
+  MXFCodedObject code(const std::shared_ptr<const MetadataRoot>& object) override;
+  const MXFKeyToTagMap& getSetPrimer(const std::type_info& type) override;
+  const KLVKey& getSetKey(const std::type_info& type) override;
+
+  virtual std::shared_ptr<MetadataRoot> create() const = 0;
+  virtual const std::type_info& getType() const = 0;
+  virtual const KLVKey& getSetKey() const = 0;
+  // The class's own properties, then its base's, down to the instance
+  // identifier and the dark properties.
+  virtual void parseProperties(const MXFPropertyMap& properties, const std::shared_ptr<MetadataRoot>& object,
+                               MXFPendingReferences& references) const;
+  // The base's properties first, then the class's own.
+  virtual void codeProperties(const std::shared_ptr<const MetadataRoot>& object, MXFPropertyMap& properties,
+                              MXFReferencedObjects& referenced) const;
+  // Whether the set may come with BER item lengths (0x13 in key octet 5).
+  virtual bool allowBERLengths() const;
+
+  MXFKeyToTagMap& getSetPrimer() { return setPrimer_; }
+  const MXFKeyToTagMap& getSetPrimer() const { return setPrimer_; }
+  // Null when the handler has gone.
+  std::shared_ptr<ErrorHandler> getErrorHandler() const { return errorHandler_.lock(); }
+
+  // Reports that raise nothing; the parse goes on.
+  void firePropertyRequiredError(const std::string& name) const;
+  void firePropertyInternalizeError(const std::string& name, const util::assertion_failure& exception) const;
+
+private:
+  MXFKeyToTagMap setPrimer_;
+  std::weak_ptr<ErrorHandler> errorHandler_;
+};
+
+// A composite: asks its sub-factories in order and remembers who answered,
+// by set key and by type.
+class MXFMetadataModelFactory : public MXFMetadataFactory {
+public:
+  typedef std::vector<std::shared_ptr<MXFMetadataFactory>> Factories;
+
+  MXFMetadataModelFactory();
+  ~MXFMetadataModelFactory() override;
+
+  void setErrorHandler(const std::shared_ptr<ErrorHandler>& errorHandler) override;
+  bool canParse(const KLVKey& setKey) override;
+  MXFParsedObject parse(const MXFPrimedSet& set) override;
+  const std::type_info& getType(const KLVKey& setKey) override;
+  bool canCode(const std::type_info& type) override;
+  MXFCodedObject code(const std::shared_ptr<const MetadataRoot>& object) override;
+  const MXFKeyToTagMap& getSetPrimer(const std::type_info& type) override;
+  const KLVKey& getSetKey(const std::type_info& type) override;
+
+  virtual const Factories& getFactories() = 0;
+  // Whether a dark property of sets of this key holds an object reference;
+  // none does unless a subclass says so.
+  virtual bool isReferenceDarkProperty(const KLVKey& setKey, const KLVKey& propertyKey);
+
+  void fireReferenceDarkPropertyInternalizeError(const KLVKey& key, const util::assertion_failure& exception) const;
+
+private:
+  MXFMetadataFactory& byType(const std::type_info& type);
+  void declareDarkReferences(const KLVKey& setKey, MXFParsedObject& parsed);
+
+  std::map<KLVKey, std::shared_ptr<MXFMetadataFactory>> keyCache_;
+  std::map<std::string, std::shared_ptr<MXFMetadataFactory>> typeCache_;
+  std::weak_ptr<ErrorHandler> errorHandler_;
+};
+
+// Whole models: the root first, then objects that nothing owns.
+class MXFMetadataModelHandler {
+public:
+  virtual ~MXFMetadataModelHandler();
+  virtual void start() = 0;
+  virtual void end() = 0;
+  virtual void model(const MXFMetadataModel& objects) = 0;
+};
+
+// Makes objects of primed sets and connects them in one sweep, each
+// reference as soon as both ends are there.
+class MXFMetadataModelParser : public MXFMetadataHandler {
+public:
+  MXFMetadataModelParser(MXFMetadataModelHandler* handler, const std::shared_ptr<MXFMetadataFactory>& factory);
+  MXFMetadataModelParser(const MXFMetadataModelParser&) = delete;
+  MXFMetadataModelParser& operator=(const MXFMetadataModelParser&) = delete;
+
+  void start() override;
+  void end() override;
+  void primer(const MXFPrimerEntries& entries) override;
+  bool acceptSet(const KLVKey& key) override;
+  void primedSet(const MXFPrimedSet& set) override;
+  // Reports vanish without one.
+  virtual void setErrorHandler(ErrorHandler* errorHandler);
+
+private:
+  bool connect(const std::shared_ptr<dangling_ref_base>& reference, const MXFUID& target, bool backward);
+  void report(bool isError, const MXFUID& identifier, const std::string& message);
+
+  MXFMetadataModel roots_;
+  MXFPendingReferences pending_;
+  std::map<MXFUID, std::shared_ptr<MetadataRoot>> instances_;
+  MXFMetadataModelHandler* handler_;
+  std::shared_ptr<MXFMetadataFactory> factory_;
+  ErrorHandler* errorHandler_ = nullptr;
+};
+
+// Walks a model depth-first into a primer and primed sets: static tags from
+// the classes, dynamic ones from 0x8000 for the rest.
+class MXFMetadataModelCoder : public MXFMetadataModelHandler {
+public:
+  MXFMetadataModelCoder(MXFMetadataHandler* handler, const std::shared_ptr<MXFMetadataFactory>& factory);
+
+  void start() override;
+  void end() override;
+  void model(const MXFMetadataModel& objects) override;
+
+private:
+  MXFMetadataHandler* handler_;
+  std::shared_ptr<MXFMetadataFactory> factory_;
+};
 
 #endif

@@ -115,4 +115,10 @@ void SetCollector::start() {
   summary_.metadata.push_back(metadata);
 }
 
+void IndexCollector::startIndex() {
+  Index index;
+  index.partition = summary_.partitions.back().offset;
+  summary_.index.push_back(index);
+}
+
 }  // namespace zelta_info

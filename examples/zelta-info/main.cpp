@@ -13,7 +13,7 @@ namespace {
 using namespace zelta_info;
 
 const char* const usage =
-    "usage: zelta-info [--json] [--sets] FILE\n"
+    "usage: zelta-info [--json] [--sets] [--index] FILE\n"
     "       zelta-info --copy OUT FILE\n"
     "\n"
     "Reads the MXF file FILE (a run-in is skipped) and prints each partition\n"
@@ -23,9 +23,12 @@ const char* const usage =
     "'error: ' or 'fatal: ' and the message.\n"
     "\n"
     "  --json   print one JSON object instead (file, result, runIn, partitions,\n"
-    "           randomIndex, metadata with --sets, reports)\n"
+    "           randomIndex, metadata with --sets, index with --index,\n"
+    "           reports)\n"
     "  --sets   also print the primer and the primed sets (set key, property\n"
     "           keys and sizes) of each partition's header metadata\n"
+    "  --index  also print every index table segment with its fields, delta\n"
+    "           entries and index entries\n"
     "  --copy OUT\n"
     "           copy FILE to OUT element by element, through the KLV reader\n"
     "           and writer\n"
@@ -36,20 +39,24 @@ const char* const usage =
 
 struct Options {
   bool json = false;
-  bool sets = false;
+  Details details;
   std::string file;
   std::string copyTo;
 };
 
 // Reads the whole file; false when a fatal error stopped the read.
-bool readFile(std::istream& in, Summary& summary, bool sets) {
+bool readFile(std::istream& in, Summary& summary, const Details& details) {
   Reporter reporter(summary);
   SetCollector setCollector(summary);
   MXFMetadataParser setParser(&setCollector);
   setParser.setErrorHandler(&reporter);
   DullKLVHandler skipper;
-  SectionCounter metadata(summary, metadataSection, sets ? static_cast<KLVHandler*>(&setParser) : &skipper);
-  SectionCounter index(summary, indexSection, &skipper);
+  IndexCollector indexCollector(summary);
+  MXFIndexParser indexParser(&indexCollector);
+  indexParser.setErrorHandler(&reporter);
+  SectionCounter metadata(summary, metadataSection,
+                          details.sets ? static_cast<KLVHandler*>(&setParser) : &skipper);
+  SectionCounter index(summary, indexSection, details.index ? static_cast<KLVHandler*>(&indexParser) : &skipper);
   SectionCounter essence(summary, essenceSection, &skipper);
   StructureCollector structure(summary);
   MXFReader reader;
@@ -105,7 +112,9 @@ bool parseOptions(int argc, char** argv, Options& options) {
     if (std::strcmp(argv[i], "--json") == 0) {
       options.json = true;
     } else if (std::strcmp(argv[i], "--sets") == 0) {
-      options.sets = true;
+      options.details.sets = true;
+    } else if (std::strcmp(argv[i], "--index") == 0) {
+      options.details.index = true;
     } else if (std::strcmp(argv[i], "--copy") == 0 && i + 1 < argc) {
       options.copyTo = argv[++i];
     } else if (argv[i][0] == '-' || !options.file.empty()) {
@@ -137,10 +146,10 @@ int main(int argc, char** argv) {
   }
   if (!options.copyTo.empty()) return copyFile(in, options.copyTo) ? 0 : 1;
   Summary summary;
-  bool ok = readFile(in, summary, options.sets);
+  bool ok = readFile(in, summary, options.details);
   if (options.json)
-    printJson(std::cout, options.file, !ok, summary, options.sets);
+    printJson(std::cout, options.file, !ok, summary, options.details);
   else
-    printText(std::cout, summary, options.sets);
+    printText(std::cout, summary, options.details);
   return ok ? 0 : 1;
 }

@@ -130,19 +130,79 @@ void printMetadataJson(std::ostream& out, const Metadata& m) {
   out << "]}";
 }
 
+std::string rational(const MXFRational& r) {
+  return std::to_string(r.numerator) + "/" + std::to_string(r.denominator);
+}
+
+void printSegmentText(std::ostream& out, const MXFIndexTableSegment& g) {
+  out << "  segment " << identifier(g.instanceUID) << ": edit rate " << rational(g.indexEditRate) << ", start "
+      << g.indexStartPosition << ", duration " << g.indexDuration << ", editUnitByteCount " << g.editUnitByteCount
+      << ", indexSID " << g.indexSID << ", bodySID " << g.bodySID << ", sliceCount "
+      << static_cast<unsigned>(g.sliceCount) << ", posTableCount " << static_cast<unsigned>(g.posTableCount) << "\n";
+  for (const MXFDeltaEntry& d : g.deltaEntryArray)
+    out << "    delta: posTableIndex " << static_cast<int>(d.posTableIndex) << ", slice "
+        << static_cast<unsigned>(d.slice) << ", elementDelta " << d.elementDelta << "\n";
+  for (const MXFIndexEntry& e : g.indexEntryArray) {
+    out << "    entry: temporalOffset " << static_cast<int>(e.temporalOffset) << ", keyFrameOffset "
+        << static_cast<int>(e.keyFrameOffset) << ", flags 0x" << std::hex << std::setw(2) << std::setfill('0')
+        << static_cast<unsigned>(e.flags) << std::dec << std::setfill(' ') << ", streamOffset " << e.streamOffset;
+    for (std::uint32_t offset : e.sliceOffsets) out << ", slice " << offset;
+    for (const MXFRational& p : e.posTable) out << ", pos " << rational(p);
+    out << "\n";
+  }
+}
+
+void printIndexText(std::ostream& out, const Index& index) {
+  out << "index of partition at " << index.partition << ": " << index.segments.size() << " segments\n";
+  for (const MXFIndexTableSegment& g : index.segments) printSegmentText(out, g);
+}
+
+void printEntryJson(std::ostream& out, const MXFIndexEntry& e) {
+  out << "{\"temporalOffset\": " << static_cast<int>(e.temporalOffset)
+      << ", \"keyFrameOffset\": " << static_cast<int>(e.keyFrameOffset)
+      << ", \"flags\": " << static_cast<unsigned>(e.flags) << ", \"streamOffset\": " << e.streamOffset
+      << ", \"sliceOffsets\": [";
+  for (std::size_t i = 0; i < e.sliceOffsets.size(); ++i) out << (i ? ", " : "") << e.sliceOffsets[i];
+  out << "], \"posTable\": [";
+  for (std::size_t i = 0; i < e.posTable.size(); ++i) out << (i ? ", " : "") << jsonString(rational(e.posTable[i]));
+  out << "]}";
+}
+
+void printSegmentJson(std::ostream& out, std::uint64_t partition, const MXFIndexTableSegment& g) {
+  out << "{\"partition\": " << partition << ", \"instanceUID\": \"" << identifier(g.instanceUID)
+      << "\", \"indexEditRate\": " << jsonString(rational(g.indexEditRate))
+      << ", \"indexStartPosition\": " << g.indexStartPosition << ", \"indexDuration\": " << g.indexDuration
+      << ", \"editUnitByteCount\": " << g.editUnitByteCount << ", \"indexSID\": " << g.indexSID
+      << ", \"bodySID\": " << g.bodySID << ", \"sliceCount\": " << static_cast<unsigned>(g.sliceCount)
+      << ", \"posTableCount\": " << static_cast<unsigned>(g.posTableCount) << ", \"deltaEntryArray\": [";
+  for (std::size_t i = 0; i < g.deltaEntryArray.size(); ++i) {
+    const MXFDeltaEntry& d = g.deltaEntryArray[i];
+    out << (i ? ", " : "") << "{\"posTableIndex\": " << static_cast<int>(d.posTableIndex)
+        << ", \"slice\": " << static_cast<unsigned>(d.slice) << ", \"elementDelta\": " << d.elementDelta << "}";
+  }
+  out << "], \"indexEntryArray\": [";
+  for (std::size_t i = 0; i < g.indexEntryArray.size(); ++i) {
+    out << (i ? ", " : "");
+    printEntryJson(out, g.indexEntryArray[i]);
+  }
+  out << "]}";
+}
+
 }  // namespace
 
-void printText(std::ostream& out, const Summary& s, bool sets) {
+void printText(std::ostream& out, const Summary& s, const Details& details) {
   if (s.runIn != 0) out << "run-in: " << s.runIn << " bytes\n";
   for (const Partition& p : s.partitions) printPartitionText(out, p);
   out << "random index: " << s.randomIndex.size() << " entries\n";
   for (const MXFRandomIndexEntry& e : s.randomIndex)
     out << "  bodySID " << e.bodySID << " at " << e.byteOffset << "\n";
-  if (sets)
+  if (details.sets)
     for (const Metadata& m : s.metadata) printMetadataText(out, m);
+  if (details.index)
+    for (const Index& index : s.index) printIndexText(out, index);
 }
 
-void printJson(std::ostream& out, const std::string& file, bool fatal, const Summary& s, bool sets) {
+void printJson(std::ostream& out, const std::string& file, bool fatal, const Summary& s, const Details& details) {
   out << "{\"file\": " << jsonString(file) << ", \"result\": \"" << (fatal ? "fatal" : "ok")
       << "\", \"runIn\": " << s.runIn << ", \"partitions\": [";
   for (std::size_t i = 0; i < s.partitions.size(); ++i) {
@@ -154,7 +214,18 @@ void printJson(std::ostream& out, const std::string& file, bool fatal, const Sum
     out << (i ? ", " : "") << "{\"bodySID\": " << s.randomIndex[i].bodySID
         << ", \"byteOffset\": " << s.randomIndex[i].byteOffset << "}";
   out << "]";
-  if (sets) {
+  if (details.index) {
+    out << ", \"index\": [";
+    bool first = true;
+    for (const Index& index : s.index)
+      for (const MXFIndexTableSegment& g : index.segments) {
+        out << (first ? "" : ", ");
+        printSegmentJson(out, index.partition, g);
+        first = false;
+      }
+    out << "]";
+  }
+  if (details.sets) {
     out << ", \"metadata\": [";
     for (std::size_t i = 0; i < s.metadata.size(); ++i) {
       out << (i ? ", " : "");

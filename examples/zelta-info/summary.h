@@ -31,6 +31,12 @@ struct Metadata {
   std::vector<MXFPrimedSet> sets;
 };
 
+// The index table segments of one partition.
+struct Index {
+  std::uint64_t partition = 0;  // the partition's offset
+  std::vector<MXFIndexTableSegment> segments;
+};
+
 struct Partition {
   std::uint64_t offset = 0;
   KLVKey key;
@@ -44,6 +50,7 @@ struct Summary {
   std::vector<Partition> partitions;
   std::vector<MXFRandomIndexEntry> randomIndex;
   std::vector<Metadata> metadata;
+  std::vector<Index> index;
   std::vector<Report> reports;
 };
 
@@ -121,8 +128,29 @@ private:
   Summary& summary_;
 };
 
-void printText(std::ostream& out, const Summary& summary, bool sets);
-void printJson(std::ostream& out, const std::string& file, bool fatal, const Summary& summary, bool sets);
+// The index table segments of each index section.
+class IndexCollector : public MXFIndexHandler {
+public:
+  explicit IndexCollector(Summary& summary) : summary_(summary) {}
+  void startIndex() override;
+  void endIndex() override {}
+  void indexTableSegment(const MXFIndexTableSegment& segment) override {
+    summary_.index.back().segments.push_back(segment);
+  }
+
+private:
+  Summary& summary_;
+};
+
+// What to print beside the partitions.
+struct Details {
+  bool sets = false;
+  bool index = false;
+};
+
+void printText(std::ostream& out, const Summary& summary, const Details& details);
+void printJson(std::ostream& out, const std::string& file, bool fatal, const Summary& summary,
+               const Details& details);
 
 }  // namespace zelta_info
 

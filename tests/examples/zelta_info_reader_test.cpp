@@ -79,4 +79,29 @@ TEST(ZeltaInfoSets, TextListsPrimerEntriesAndSets) {
   EXPECT_NE(run.out.find("  set 06.0E.2B.34.02.53.01.01.0D.01.01.01.01.01.2F.00\n"), std::string::npos);
 }
 
+TEST(ZeltaInfoIndex, SegmentFieldsAndDeltaEntriesAsAnIndependentDumpGivesThem) {
+  // The mxfdump of the ffmpeg D-10 file: one segment at 0x1400 with
+  // instanceUID ad.ab.44.24.2f.25.4d.c7.92.ff.00.0f.00.00.00.00, edit rate
+  // 25/1, start 0, duration 0 (open), 0x3d400 octets per edit unit, indexSID 2,
+  // bodySID 1, slice count 0 and the delta entries 0 and 512.
+  ProgramRun run = runZeltaInfo("--json --index " + dataPath("ffmpeg_d10_50m_625_noaudio.mxf"));
+  EXPECT_EQ(run.status, 0) << run.err;
+  EXPECT_NE(run.out.find("\"index\": [{\"partition\": 0, \"instanceUID\": \"adab44242f254dc792ff000f00000000\", "
+                         "\"indexEditRate\": \"25/1\", \"indexStartPosition\": 0, \"indexDuration\": 0, "
+                         "\"editUnitByteCount\": 250880, \"indexSID\": 2, \"bodySID\": 1, \"sliceCount\": 0, "
+                         "\"posTableCount\": 0, \"deltaEntryArray\": [{\"posTableIndex\": 0, \"slice\": 0, "
+                         "\"elementDelta\": 0}, {\"posTableIndex\": 0, \"slice\": 0, \"elementDelta\": 512}], "
+                         "\"indexEntryArray\": []}]"),
+            std::string::npos)
+      << run.out;
+}
+
+TEST(ZeltaInfoIndex, TextListsEntriesOfAVariableSizeIndex) {
+  // The footer index of the ffmpeg long GOP file holds one entry per frame.
+  ProgramRun run = runZeltaInfo("--index " + dataPath("ffmpeg_h264_high_longgop_1080p25_2mono.mxf"));
+  EXPECT_EQ(run.status, 0) << run.err;
+  EXPECT_NE(run.out.find("index of partition at 1175552: 1 segments\n"), std::string::npos) << run.out;
+  EXPECT_EQ(count(run.out, "    entry: "), 24u);
+}
+
 }  // namespace

@@ -1,0 +1,189 @@
+// A class's properties as data: name, key, static tag, presence and how the
+// value is read and written through the class's own accessors. A class
+// factory hands its table to the set primer in its constructor and to the
+// parse and code helpers below, so that each class states its properties
+// once.
+#ifndef ZELTA_METADATA_PROPERTY_TABLE_H
+#define ZELTA_METADATA_PROPERTY_TABLE_H
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "metadata.h"
+
+namespace zelta {
+
+enum class Presence { required, optional };
+
+template <typename C>
+struct PropertyDescriptor {
+  // Decodes the octets into the object, or enters pending references.
+  typedef std::function<void(const std::shared_ptr<C>&, const ByteVector&, MXFPendingReferences&)> Parser;
+  // Writes the value; false when an optional property is unset.
+  typedef std::function<bool(const C&, ByteVector&, MXFReferencedObjects&)> Coder;
+
+  std::string name;  // class, point, property: "Sequence.components"
+  KLVKey key;
+  std::uint16_t tag;  // 0: dynamic
+  Presence presence;
+  Parser parse;
+  Coder code;
+};
+
+template <typename C>
+class PropertyTable {
+public:
+  // The class name goes into the check of the object's class.
+  PropertyTable(const std::string& className, std::vector<PropertyDescriptor<C>> properties)
+      : isClass_("object is a " + className), properties_(std::move(properties)) {}
+
+  void enterInto(MXFKeyToTagMap& setPrimer) const {
+    for (const PropertyDescriptor<C>& property : properties_) setPrimer[property.key] = property.tag;
+  }
+
+  // Reports what is missing or can't be read, and goes on.
+  void parse(const MetadataRootFactory& factory, const MXFPropertyMap& properties,
+             const std::shared_ptr<MetadataRoot>& object, MXFPendingReferences& references) const {
+    const std::shared_ptr<C> typed = std::dynamic_pointer_cast<C>(object);
+    check(typed != nullptr, isClass_);
+    for (const PropertyDescriptor<C>& property : properties_) {
+      const MXFPropertyMap::const_iterator found = properties.find(property.key);
+      if (found == properties.end()) {
+        if (property.presence == Presence::required) factory.firePropertyRequiredError(property.name);
+        continue;
+      }
+      try {
+        property.parse(typed, found->second, references);
+      } catch (const util::assertion_failure& exception) {
+        factory.firePropertyInternalizeError(property.name, exception);
+      }
+    }
+  }
+
+  const C& cast(const std::shared_ptr<const MetadataRoot>& object) const {
+    const C* typed = dynamic_cast<const C*>(object.get());
+    check(typed != nullptr, isClass_);
+    return *typed;
+  }
+
+  void code(const C& object, MXFPropertyMap& properties, MXFReferencedObjects& referenced) const {
+    for (const PropertyDescriptor<C>& property : properties_) {
+      ByteVector bytes;
+      if (property.code(object, bytes, referenced)) properties[property.key] = std::move(bytes);
+    }
+  }
+
+private:
+  std::string isClass_;
+  std::vector<PropertyDescriptor<C>> properties_;
+};
+
+// Descriptors by kind of property, over the accessors of the class.
+
+template <typename C, typename T>
+PropertyDescriptor<C> requiredValue(const std::string& name, const KLVKey& key, std::uint16_t tag,
+                                    const T& (C::*getter)() const, void (C::*setter)(const T&)) {
+  return {name, key, tag, Presence::required,
+          [setter](const std::shared_ptr<C>& object, const ByteVector& bytes, MXFPendingReferences&) {
+            T value;
+            internalize(bytes, value);
+            ((*object).*setter)(value);
+          },
+          [getter](const C& object, ByteVector& bytes, MXFReferencedObjects&) {
+            externalize(bytes, (object.*getter)(), true);
+            return true;
+          }};
+}
+
+template <typename C, typename T>
+PropertyDescriptor<C> optionalValue(const std::string& name, const KLVKey& key, std::uint16_t tag,
+                                    const T& (C::*getter)() const, void (C::*setter)(const T&),
+                                    bool (C::*has)() const) {
+  PropertyDescriptor<C> descriptor = requiredValue(name, key, tag, getter, setter);
+  descriptor.presence = Presence::optional;
+  descriptor.code = [getter, has](const C& object, ByteVector& bytes, MXFReferencedObjects&) {
+    if (!(object.*has)()) return false;
+    externalize(bytes, (object.*getter)(), true);
+    return true;
+  };
+  return descriptor;
+}
+
+// A single reference; a null has means required. Strong references list
+// their target among the owned objects, weak ones only name it.
+template <typename C, typename V>
+PropertyDescriptor<C> singleReference(const std::string& name, const KLVKey& key, std::uint16_t tag, bool strong,
+                                      std::shared_ptr<const V> (C::*getter)() const,
+                                      void (C::*setter)(const std::shared_ptr<V>&), bool (C::*has)() const) {
+  const std::string isPresent = name + " is present";
+  return {name, key, tag, has ? Presence::optional : Presence::required,
+          [setter, strong](const std::shared_ptr<C>& object, const ByteVector& bytes, MXFPendingReferences& pending) {
+            MXFUID target;
+            internalize(bytes, target);
+            pending.emplace(target, std::make_shared<dangling_ref_t<C, V>>(object, setter, strong));
+          },
+          [getter, has, strong, isPresent](const C& object, ByteVector& bytes, MXFReferencedObjects& referenced) {
+            if (has && !(object.*has)()) return false;
+            const std::shared_ptr<const V> target = (object.*getter)();
+            check(target != nullptr, isPresent);
+            if (strong) referenced.push_back(target);
+            externalize(bytes, target->getInstanceUID(), true);
+            return true;
+          }};
+}
+
+template <typename C, typename V>
+PropertyDescriptor<C> strongReference(const std::string& name, const KLVKey& key, std::uint16_t tag,
+                                      std::shared_ptr<const V> (C::*getter)() const,
+                                      void (C::*setter)(const std::shared_ptr<V>&),
+                                      bool (C::*has)() const = nullptr) {
+  return singleReference<C, V>(name, key, tag, true, getter, setter, has);
+}
+
+template <typename C, typename V>
+PropertyDescriptor<C> weakReference(const std::string& name, const KLVKey& key, std::uint16_t tag,
+                                    std::shared_ptr<const V> (C::*getter)() const,
+                                    void (C::*setter)(const std::shared_ptr<V>&), bool (C::*has)() const = nullptr) {
+  return singleReference<C, V>(name, key, tag, false, getter, setter, has);
+}
+
+// A vector of strong references, written as a batch of identifiers; the
+// element's name ("Sequence.component") goes into the check of a null
+// element. A null has means required.
+template <typename C, typename V>
+PropertyDescriptor<C> referenceVector(const std::string& name, const std::string& elementName, const KLVKey& key,
+                                      std::uint16_t tag, std::size_t (C::*count)() const,
+                                      std::shared_ptr<const V> (C::*at)(std::size_t) const,
+                                      void (C::*inserter)(std::size_t, const std::shared_ptr<V>&),
+                                      bool (C::*has)() const = nullptr) {
+  typedef dangling_vector_ref_t<C, V> Element;
+  const std::string isPresent = elementName + " is present";
+  return {name, key, tag, has ? Presence::optional : Presence::required,
+          [inserter](const std::shared_ptr<C>& object, const ByteVector& bytes, MXFPendingReferences& pending) {
+            std::vector<MXFUID> targets;
+            internalize(bytes, targets);
+            std::shared_ptr<Element> previous;
+            for (const MXFUID& target : targets) {
+              previous = std::make_shared<Element>(object, inserter, previous, true);
+              pending.emplace(target, previous);
+            }
+          },
+          [count, at, has, isPresent](const C& object, ByteVector& bytes, MXFReferencedObjects& referenced) {
+            if (has && !(object.*has)()) return false;
+            std::vector<MXFUID> targets;
+            for (std::size_t i = 0; i < (object.*count)(); ++i) {
+              const std::shared_ptr<const V> target = (object.*at)(i);
+              check(target != nullptr, isPresent);
+              referenced.push_back(target);
+              targets.push_back(target->getInstanceUID());
+            }
+            externalize(bytes, targets, true);
+            return true;
+          }};
+}
+
+}  // namespace zelta
+
+#endif
