@@ -55,7 +55,8 @@ bool MXFMetadataModelFactory::canCode(const std::type_info& type) {
 
 MXFCodedObject MXFMetadataModelFactory::code(const std::shared_ptr<const MetadataRoot>& object) {
   check(object != nullptr, "can handle type");
-  return byType(typeid(*object)).code(object);
+  const MetadataRoot& root = *object;
+  return byType(typeid(root)).code(object);
 }
 
 const MXFKeyToTagMap& MXFMetadataModelFactory::getSetPrimer(const std::type_info& type) {

@@ -70,9 +70,12 @@ void MXFMetadataModelCoder::model(const MXFMetadataModel& objects) {
   while (!work.empty()) {
     const std::shared_ptr<const MetadataRoot> object = work.front();
     work.pop_front();
-    check(object != nullptr && factory_->canCode(typeid(*object)), "can handle object");
+    check(object != nullptr, "can handle object");
+    const MetadataRoot& root = *object;
+    const std::type_info& type = typeid(root);
+    check(factory_->canCode(type), "can handle object");
     MXFCodedObject coded = factory_->code(object);
-    mergeStaticTags(factory_->getSetPrimer(typeid(*object)), coded.set, primer);
+    mergeStaticTags(factory_->getSetPrimer(type), coded.set, primer);
     mergeDarkProperties(*object, primer, order);
     output.emplace_back(object->getInstanceUID(), std::move(coded.set));
     work.splice(work.begin(), coded.referenced);
