@@ -10,13 +10,13 @@ using zelta::klv::readBERLength;
 using zelta::klv::readBigEndian;
 using zelta::klv::readKey;
 using zelta::klv::skipValue;
+using zelta::klv::smptePrefix;
 using zelta::klv::transferValue;
 using zelta::klv::withKey;
 using zelta::klv::withOctet;
 
 namespace {
 
-constexpr std::uint8_t smptePrefix[4] = {0x06, 0x0E, 0x2B, 0x34};
 
 // Group codings by the low three bits of key octet 5.
 constexpr std::uint8_t universalSetCoding = 1;

@@ -10,6 +10,9 @@
 
 namespace zelta::klv {
 
+// The first four octets of every SMPTE key.
+inline constexpr std::uint8_t smptePrefix[4] = {0x06, 0x0E, 0x2B, 0x34};
+
 // Whether the stream's buffer can tell where it is: a zero relative seek that
 // does not answer -1. A buffer that cannot is read as a pipe.
 bool isSeekable(std::istream& stream);

@@ -117,8 +117,7 @@ void VerifyingKLVHandler::value(const std::uint8_t*, std::streamsize) {}
 
 namespace {
 
-constexpr std::uint8_t keyPrefix[4] = {0x06, 0x0E, 0x2B, 0x34};
-constexpr std::streamoff prefixOctets = 4;
+constexpr std::streamoff prefixOctets = sizeof zelta::klv::smptePrefix;
 
 // Back to the first octet of the prefix just read.
 void backUpOverPrefix(std::istream& stream) {
@@ -130,7 +129,7 @@ void backUpOverPrefix(std::istream& stream) {
   }
   std::streambuf* buffer = stream.rdbuf();
   for (std::streamoff i = prefixOctets; i-- > 0;) {
-    const auto octet = static_cast<char>(keyPrefix[i]);
+    const auto octet = static_cast<char>(zelta::klv::smptePrefix[i]);
     check(buffer->sputbackc(octet) != std::istream::traits_type::eof(), "successful putback()");
   }
 }
@@ -151,10 +150,10 @@ bool findKey(std::istream& stream, std::streamoff limit) {
         return false;
       }
       ++read;
-      if (static_cast<std::uint8_t>(c) == keyPrefix[matched])
+      if (static_cast<std::uint8_t>(c) == zelta::klv::smptePrefix[matched])
         ++matched;
       else
-        matched = static_cast<std::uint8_t>(c) == keyPrefix[0] ? 1 : 0;
+        matched = static_cast<std::uint8_t>(c) == zelta::klv::smptePrefix[0] ? 1 : 0;
       if (limit != -1 && read - matched > limit) return false;
     }
   }

@@ -11,6 +11,7 @@
 namespace {
 
 using zelta_test::dataPath;
+using zelta_test::occurrences;
 using zelta_test::ProgramRun;
 using zelta_test::runZeltaInfo;
 
@@ -22,12 +23,6 @@ std::string hexOf(const MXFUID& id) {
     out += digits[id[i] & 15];
   }
   return out;
-}
-
-std::size_t count(const std::string& text, const std::string& what) {
-  std::size_t n = 0;
-  for (std::string::size_type at = text.find(what); at != std::string::npos; at = text.find(what, at + 1)) ++n;
-  return n;
 }
 
 TEST(ZeltaInfoOnDamage, FlippedHeaderPartitionKeyStopsAtTheFirstElement) {
@@ -54,7 +49,7 @@ TEST(ZeltaInfoOnDamage, TruncatedInsideASkippedBodyElementEndsNormally) {
   EXPECT_EQ(run.status, 0) << run.err;
   EXPECT_EQ(run.err, "");
   EXPECT_NE(run.out.find("\"result\": \"ok\""), std::string::npos);
-  EXPECT_EQ(count(run.out, "{\"offset\": "), 3u);
+  EXPECT_EQ(occurrences(run.out, "{\"offset\": "), 3u);
   EXPECT_NE(run.out.find("{\"offset\": 22461, \"kind\": \"body\", \"status\": \"closed complete\""),
             std::string::npos)
       << run.out;
@@ -65,7 +60,7 @@ TEST(ZeltaInfoOnDamage, MissingRandomIndexEndsNormallyWithoutOne) {
   ProgramRun run = runZeltaInfo("--json " + dataPath("damaged_no_rip.mxf"));
   EXPECT_EQ(run.status, 0) << run.err;
   EXPECT_EQ(run.err, "");
-  EXPECT_EQ(count(run.out, "{\"offset\": "), 2u);
+  EXPECT_EQ(occurrences(run.out, "{\"offset\": "), 2u);
   EXPECT_NE(run.out.find("\"randomIndex\": []"), std::string::npos);
 }
 

@@ -13,14 +13,9 @@
 namespace {
 
 using zelta_test::dataPath;
+using zelta_test::occurrences;
 using zelta_test::ProgramRun;
 using zelta_test::runZeltaInfo;
-
-std::size_t count(const std::string& text, const std::string& what) {
-  std::size_t n = 0;
-  for (std::string::size_type at = text.find(what); at != std::string::npos; at = text.find(what, at + 1)) ++n;
-  return n;
-}
 
 TEST(ZeltaInfoRunIn, RunInIsSkippedCountedAndMovesEveryOffset) {
   // 1000 octets of 0x55 hold no partition key.
@@ -63,12 +58,12 @@ TEST(ZeltaInfoSets, HeaderMetadataArrivesAsPrimerAndPrimedSets) {
   // the dump) where the format asks for four octets: warnings only.
   EXPECT_NE(run.err.find("warning: non-standard BER length form - 0x81\n"), std::string::npos) << run.err;
   EXPECT_EQ(run.err.find("error: "), std::string::npos) << run.err;
-  EXPECT_EQ(count(run.out, "{\"partition\": "), 1u);
+  EXPECT_EQ(occurrences(run.out, "{\"partition\": "), 1u);
   EXPECT_NE(run.out.find("\"metadata\": [{\"partition\": 0, \"primer\": [{\"tag\": "), std::string::npos);
-  EXPECT_EQ(count(run.out, "{\"tag\": "), 100u);
-  EXPECT_EQ(count(run.out, "\"properties\": ["), 19u);
-  EXPECT_EQ(count(run.out, "{\"key\": \"06.0E.2B.34.02.53.01.01.0D.01.01.01.01.01.2F.00\", \"properties\""), 1u);
-  EXPECT_EQ(count(run.out, "{\"key\": \"06.0E.2B.34.02.53.01.01.0D.01.01.01.01.01.3B.00\", \"properties\""), 4u);
+  EXPECT_EQ(occurrences(run.out, "{\"tag\": "), 100u);
+  EXPECT_EQ(occurrences(run.out, "\"properties\": ["), 19u);
+  EXPECT_EQ(occurrences(run.out, "{\"key\": \"06.0E.2B.34.02.53.01.01.0D.01.01.01.01.01.2F.00\", \"properties\""), 1u);
+  EXPECT_EQ(occurrences(run.out, "{\"key\": \"06.0E.2B.34.02.53.01.01.0D.01.01.01.01.01.3B.00\", \"properties\""), 4u);
 }
 
 TEST(ZeltaInfoSets, TextListsPrimerEntriesAndSets) {
@@ -101,7 +96,7 @@ TEST(ZeltaInfoIndex, TextListsEntriesOfAVariableSizeIndex) {
   ProgramRun run = runZeltaInfo("--index " + dataPath("ffmpeg_h264_high_longgop_1080p25_2mono.mxf"));
   EXPECT_EQ(run.status, 0) << run.err;
   EXPECT_NE(run.out.find("index of partition at 1175552: 1 segments\n"), std::string::npos) << run.out;
-  EXPECT_EQ(count(run.out, "    entry: "), 24u);
+  EXPECT_EQ(occurrences(run.out, "    entry: "), 24u);
 }
 
 }  // namespace

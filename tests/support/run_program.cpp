@@ -30,4 +30,10 @@ ProgramRun runProgram(const std::string& commandLine) {
 
 ProgramRun runZeltaInfo(const std::string& arguments) { return runProgram(std::string(ZELTA_INFO) + " " + arguments); }
 
+std::size_t occurrences(const std::string& text, const std::string& what) {
+  std::size_t n = 0;
+  for (std::string::size_type at = text.find(what); at != std::string::npos; at = text.find(what, at + 1)) ++n;
+  return n;
+}
+
 }  // namespace zelta_test

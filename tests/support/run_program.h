@@ -2,6 +2,7 @@
 #ifndef ZELTA_TESTS_SUPPORT_RUN_PROGRAM_H
 #define ZELTA_TESTS_SUPPORT_RUN_PROGRAM_H
 
+#include <cstddef>
 #include <string>
 
 namespace zelta_test {
@@ -17,6 +18,9 @@ ProgramRun runProgram(const std::string& commandLine);
 
 // zelta-info of this build with the arguments.
 ProgramRun runZeltaInfo(const std::string& arguments);
+
+// How often `what` stands in `text`, overlaps included.
+std::size_t occurrences(const std::string& text, const std::string& what);
 
 }  // namespace zelta_test
 
