@@ -311,6 +311,28 @@ private:
   std::weak_ptr<ErrorHandler> errorHandler_;
 };
 
+// The factory of a class C whose base class's factory is Base. Its
+// properties are a table beside the class, so that a concrete factory is
+// one line: class SequenceFactory : public MetadataClassFactory<Sequence,
+// SegmentFactory> {}. The constructor enters the class's own properties
+// into the set primer, behind those of Base.
+template <typename C, typename Base>
+class MetadataClassFactory : public Base {
+public:
+  MetadataClassFactory();
+  ~MetadataClassFactory() override;
+
+  std::shared_ptr<MetadataRoot> create() const override { return C::create(); }
+  const std::type_info& getType() const override { return typeid(C); }
+  const KLVKey& getSetKey() const override;
+  void parseProperties(const MXFPropertyMap& properties, const std::shared_ptr<MetadataRoot>& object,
+                       MXFPendingReferences& references) const override;
+  void codeProperties(const std::shared_ptr<const MetadataRoot>& object, MXFPropertyMap& properties,
+                      MXFReferencedObjects& referenced) const override;
+};
+
+class MetadataObjectFactory : public MetadataClassFactory<MetadataObject, MetadataRootFactory> {};
+
 // A composite: asks its sub-factories in order and remembers who answered,
 // by set key and by type.
 class MXFMetadataModelFactory : public MXFMetadataFactory {
@@ -396,5 +418,14 @@ private:
   MXFMetadataHandler* handler_;
   std::shared_ptr<MXFMetadataFactory> factory_;
 };
+
+// ---------------------------------------------------------------------------
+// Structural metadata classes
+
+// ---------------------------------------------------------------------------
+// Locators and descriptors
+
+// ---------------------------------------------------------------------------
+// The composite of the format's classes
 
 #endif

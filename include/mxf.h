@@ -661,4 +661,60 @@ private:
   GenericKLVWriter writer_;
 };
 
+// ---------------------------------------------------------------------------
+// Generic container: events
+//
+// A generic container is a run of edit units, each an optional system item
+// and essence elements. Reading, the splitter calls these; writing, the
+// muxer implements them, so that a reader pipes into a writer.
+
+typedef std::vector<std::pair<std::uint16_t, ByteVector>> MXFGCLocalItems;
+typedef std::vector<ByteVector> MXFGCVariableItems;
+
+class MXFGCStructureHandler {
+public:
+  virtual ~MXFGCStructureHandler();
+  // kagSize is 0 when reading.
+  virtual void start(std::uint64_t kagSize) = 0;
+  virtual void end() = 0;
+  virtual void startEditUnit() = 0;
+  virtual void endEditUnit() = 0;
+  // Writing only: how a producer of edit units asks for a layout.
+  virtual void startSlice() = 0;
+  virtual void endSlice() = 0;
+  virtual void startPaddedElement(std::uint64_t paddedLength) = 0;
+  virtual void endPaddedElement() = 0;
+  virtual void startAlignedElement(std::uint64_t alignment) = 0;
+  virtual void endAlignedElement() = 0;
+};
+
+class MXFGCSystemHandler {
+public:
+  virtual ~MXFGCSystemHandler();
+  // True when the element is wanted.
+  virtual bool startSystemElement(const KLVKey& key) = 0;
+  virtual void systemLocalSet(const KLVKey& key, const MXFGCLocalItems& items) = 0;
+  virtual void systemFixedPack(const KLVKey& key, const ByteVector& bytes) = 0;
+  virtual void systemVariablePack(const KLVKey& key, const MXFGCVariableItems& items) = 0;
+};
+
+class MXFGCEssenceHandler {
+public:
+  virtual ~MXFGCEssenceHandler();
+  // True when the element is wanted. The handler may point buffer at memory
+  // of its own of at least length octets, which the value is read into.
+  virtual bool startEssenceElement(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) = 0;
+  virtual void pictureElement(const KLVKey& key, const std::uint8_t* data, std::uint64_t length) = 0;
+  virtual void soundElement(const KLVKey& key, const std::uint8_t* data, std::uint64_t length) = 0;
+  virtual void dataElement(const KLVKey& key, const std::uint8_t* data, std::uint64_t length) = 0;
+  virtual void compoundElement(const KLVKey& key, const std::uint8_t* data, std::uint64_t length) = 0;
+  virtual void essenceLengthForm(std::uint8_t form) = 0;
+};
+
+// ---------------------------------------------------------------------------
+// Generic container splitting
+
+// ---------------------------------------------------------------------------
+// Generic container multiplexing
+
 #endif

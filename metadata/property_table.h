@@ -38,6 +38,11 @@ public:
   // The class name goes into the check of the object's class.
   PropertyTable(const std::string& className, std::vector<PropertyDescriptor<C>> properties)
       : isClass_("object is a " + className), properties_(std::move(properties)) {}
+  // The table of a class of the format, with the key of its sets.
+  PropertyTable(const std::string& className, const KLVKey& setKey, std::vector<PropertyDescriptor<C>> properties)
+      : isClass_("object is a " + className), setKey_(setKey), properties_(std::move(properties)) {}
+
+  const KLVKey& getSetKey() const { return setKey_; }
 
   void enterInto(MXFKeyToTagMap& setPrimer) const {
     for (const PropertyDescriptor<C>& property : properties_) setPrimer[property.key] = property.tag;
@@ -77,8 +82,17 @@ public:
 
 private:
   std::string isClass_;
+  KLVKey setKey_;
   std::vector<PropertyDescriptor<C>> properties_;
 };
+
+// The table of class C, defined beside the class's factory.
+template <typename C>
+const PropertyTable<C>& propertyTable();
+
+// A property key of the standard primer, by its static tag, so that the
+// class tables do not spell the keys a second time.
+inline const KLVKey& standardKey(std::uint16_t tag) { return getMXFStandardPrimerKeys().at(tag); }
 
 // Descriptors by kind of property, over the accessors of the class.
 
@@ -185,5 +199,39 @@ PropertyDescriptor<C> referenceVector(const std::string& name, const std::string
 }
 
 }  // namespace zelta
+
+// The class factory template over the tables. Each class's source file
+// instantiates it explicitly, so that the library exports every factory.
+
+template <typename C, typename Base>
+MetadataClassFactory<C, Base>::MetadataClassFactory() {
+  zelta::propertyTable<C>().enterInto(this->getSetPrimer());
+}
+
+template <typename C, typename Base>
+MetadataClassFactory<C, Base>::~MetadataClassFactory() = default;
+
+template <typename C, typename Base>
+const KLVKey& MetadataClassFactory<C, Base>::getSetKey() const {
+  return zelta::propertyTable<C>().getSetKey();
+}
+
+template <typename C, typename Base>
+void MetadataClassFactory<C, Base>::parseProperties(const MXFPropertyMap& properties,
+                                                    const std::shared_ptr<MetadataRoot>& object,
+                                                    MXFPendingReferences& references) const {
+  zelta::propertyTable<C>().parse(*this, properties, object, references);
+  Base::parseProperties(properties, object, references);
+}
+
+template <typename C, typename Base>
+void MetadataClassFactory<C, Base>::codeProperties(const std::shared_ptr<const MetadataRoot>& object,
+                                                   MXFPropertyMap& properties,
+                                                   MXFReferencedObjects& referenced) const {
+  const zelta::PropertyTable<C>& table = zelta::propertyTable<C>();
+  const C& typed = table.cast(object);
+  Base::codeProperties(object, properties, referenced);
+  table.code(typed, properties, referenced);
+}
 
 #endif

@@ -1,0 +1,7 @@
+#include "mxf.h"
+
+MXFGCStructureHandler::~MXFGCStructureHandler() = default;
+
+MXFGCSystemHandler::~MXFGCSystemHandler() = default;
+
+MXFGCEssenceHandler::~MXFGCEssenceHandler() = default;
