@@ -2,51 +2,37 @@
 // read() loop over the same file.
 #include <benchmark/benchmark.h>
 
-#include <fcntl.h>
-#include <unistd.h>
-
-#include <cstdio>
-#include <cstdlib>
-#include <filesystem>
 #include <fstream>
 #include <string>
 #include <vector>
 
+#include "bench_files.h"
 #include "klv.h"
+
+using zelta_bench::leastFileOctets;
 
 namespace {
 
 constexpr std::uint64_t valueOctets = 250000;
 constexpr std::uint64_t elementOctets = 16 + 4 + valueOctets;
-constexpr std::uint64_t leastFileOctets = std::uint64_t(1) << 30;
 constexpr std::uint64_t elementCount = (leastFileOctets + elementOctets - 1) / elementOctets;
 constexpr std::uint64_t fileOctets = elementCount * elementOctets;
-constexpr std::size_t plainBufferOctets = std::size_t(1) << 20;
 
 const KLVKey pictureKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x02, 0x01, 0x01, 0x0D, 0x01,
                                                      0x03, 0x01, 0x05, 0x01, 0x01, 0x00});
 
-std::string benchFilePath;
-
-void removeBenchFile() { std::remove(benchFilePath.c_str()); }
-
-// Written once per process with the library's own writer, removed at exit.
+// Written once per process with the library's own writer.
 const std::string& benchFile() {
-  if (!benchFilePath.empty()) return benchFilePath;
-  benchFilePath = (std::filesystem::temp_directory_path() /
-                   ("zelta_klv_read_bench_" + std::to_string(::getpid()) + ".klv"))
-                      .string();
-  std::atexit(removeBenchFile);
-  std::ofstream out(benchFilePath, std::ios::binary);
-  GenericKLVWriter writer(out);
-  const std::vector<std::uint8_t> picture(valueOctets, 0x5A);
-  writer.startStream(true);
-  writer.setLengthForm(0x83);
-  for (std::uint64_t i = 0; i < elementCount; ++i) writeIndividualItem(writer, pictureKey, picture.data(), valueOctets);
-  writer.endStream(false);
-  out.close();
-  check(!out.fail(), "bench file written");
-  return benchFilePath;
+  static const std::string path = zelta_bench::writeBenchFile("zelta_klv_read_bench.klv", [](std::ostream& out) {
+    GenericKLVWriter writer(out);
+    const std::vector<std::uint8_t> picture(valueOctets, 0x5A);
+    writer.startStream(true);
+    writer.setLengthForm(0x83);
+    for (std::uint64_t i = 0; i < elementCount; ++i)
+      writeIndividualItem(writer, pictureKey, picture.data(), valueOctets);
+    writer.endStream(false);
+  });
+  return path;
 }
 
 // Takes every value into a buffer of its own, or skips them all.
@@ -69,11 +55,6 @@ private:
   std::vector<std::uint8_t> own_;
 };
 
-void report(benchmark::State& state, std::uint64_t octets, std::uint64_t elements) {
-  state.SetBytesProcessed(static_cast<std::int64_t>(octets));
-  state.counters["elements"] = benchmark::Counter(static_cast<double>(elements), benchmark::Counter::kIsRate);
-}
-
 void readWithHandler(benchmark::State& state, bool take) {
   const std::string& path = benchFile();
   std::uint64_t elements = 0;
@@ -88,7 +69,7 @@ void readWithHandler(benchmark::State& state, bool take) {
     elements += handler.elements;
     octets += fileOctets;
   }
-  report(state, octets, elements);
+  zelta_bench::reportThroughput(state, octets, elements);
 }
 
 void BM_ReaderTakingValues(benchmark::State& state) { readWithHandler(state, true); }
@@ -96,20 +77,7 @@ void BM_ReaderTakingValues(benchmark::State& state) { readWithHandler(state, tru
 void BM_ReaderSkippingValues(benchmark::State& state) { readWithHandler(state, false); }
 
 void BM_PlainReadLoop(benchmark::State& state) {
-  const std::string& path = benchFile();
-  std::vector<char> buffer(plainBufferOctets);
-  std::uint64_t octets = 0;
-  for (auto _ : state) {
-    const int fd = ::open(path.c_str(), O_RDONLY);
-    check(fd >= 0, "bench file opened");
-    std::uint64_t total = 0;
-    for (ssize_t n; (n = ::read(fd, buffer.data(), buffer.size())) > 0;) total += static_cast<std::uint64_t>(n);
-    ::close(fd);
-    check(total == fileOctets, "whole bench file read");
-    benchmark::DoNotOptimize(buffer.data());
-    octets += total;
-  }
-  report(state, octets, octets / elementOctets);
+  zelta_bench::plainReadLoop(state, benchFile(), fileOctets, elementOctets);
 }
 
 }  // namespace

@@ -693,8 +693,9 @@ private:
 // ---------------------------------------------------------------------------
 // Position filters and the fill item key check
 
-// Takes the position from the input stream before every event; the position
-// at a start event is the first octet of the value.
+// Takes the position from the input stream at the ends of a stream and counts
+// it from the coding at the events between; the position at a start event is
+// the first octet of the value.
 class KLVTeller : public DullKLVFilter {
 public:
   KLVTeller(std::istream& stream, KLVHandler* handler = nullptr);
@@ -727,8 +728,18 @@ public:
 
 private:
   void refresh();
+  void advance(std::streamoff octets);
+  bool noteStart(bool taken, std::uint64_t length);
+  void endElement();
   std::istream* stream_;
   InputLocator locator_;
+  // What the count needs of the coding; a position of -1 is told instead.
+  std::streamoff position_ = -1;
+  unsigned lengthOctets_ = 0;
+  unsigned tagOctets_ = 0;
+  unsigned itemLengthOctets_ = 0;
+  bool itemLengthIsBER_ = false;
+  std::uint64_t skipped_ = 0;
 };
 
 // Computes the position from the events alone, for pipes and output chains.

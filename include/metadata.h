@@ -253,6 +253,11 @@ struct MXFCodedObject {
   MXFReferencedObjects referenced;
 };
 
+// The name and kind of each property of a class chain, by key; told under
+// "Property descriptions" at the end.
+struct MXFPropertyDescription;
+typedef std::map<KLVKey, MXFPropertyDescription> MXFPropertyDescriptions;
+
 class MXFMetadataFactory {
 public:
   virtual ~MXFMetadataFactory();
@@ -306,9 +311,22 @@ public:
   void firePropertyRequiredError(const std::string& name) const;
   void firePropertyInternalizeError(const std::string& name, const util::assertion_failure& exception) const;
 
+  // What the set primer holds, named: every property of the class chain,
+  // the instance identifier among them. The class name is the most derived
+  // class's, "MetadataRoot" at the root.
+  const MXFPropertyDescriptions& getPropertyDescriptions() const { return descriptions_; }
+  const std::string& getClassName() const { return className_; }
+
+protected:
+  // For the constructors, which fill both beside the set primer.
+  MXFPropertyDescriptions& describedProperties() { return descriptions_; }
+  void setClassName(const std::string& className) { className_ = className; }
+
 private:
   MXFKeyToTagMap setPrimer_;
   std::weak_ptr<ErrorHandler> errorHandler_;
+  MXFPropertyDescriptions descriptions_;
+  std::string className_;
 };
 
 // The factory of a class C whose base class's factory is Base. Its
@@ -421,11 +439,1129 @@ private:
 
 // ---------------------------------------------------------------------------
 // Structural metadata classes
+//
+// The header metadata of a file: the Preface with its Identifications, the
+// ContentStorage, the packages with their tracks and components. A
+// required value always has one, at worst its default; the getter of an
+// optional one checks that it is present. Reference vectors own their
+// elements; the count of an unset optional vector is 0.
+
+class Identification;
+class ContentStorage;
+class EssenceContainerData;
+class GenericPackage;
+class Track;
+class Component;
+class Segment;
+class SourceReference;
+class DescriptiveMetadataFramework;
+class GenericDescriptor;
+
+class Preface : public MetadataObject {
+public:
+  // lastModifiedDate the present UTC time, version 0x0102.
+  Preface();
+  ~Preface() override;
+
+  static std::shared_ptr<Preface> create();
+
+  const MXFTimestamp& getLastModifiedDate() const { return lastModifiedDate_; }
+  void setLastModifiedDate(const MXFTimestamp& lastModifiedDate) { lastModifiedDate_ = lastModifiedDate; }
+  const std::uint16_t& getVersion() const { return version_; }
+  void setVersion(const std::uint16_t& version) { version_ = version; }
+  const std::uint32_t& getObjectModelVersion() const;
+  void setObjectModelVersion(const std::uint32_t& objectModelVersion) { objectModelVersion_ = objectModelVersion; }
+  bool hasObjectModelVersion() const { return objectModelVersion_.has_value(); }
+  void removeObjectModelVersion() { objectModelVersion_.reset(); }
+
+  // The one property that does not own: null once the package has gone.
+  std::shared_ptr<GenericPackage> getPrimaryPackage();
+  std::shared_ptr<const GenericPackage> getPrimaryPackage() const;
+  void setPrimaryPackage(const std::shared_ptr<GenericPackage>& primaryPackage);
+  bool hasPrimaryPackage() const { return hasPrimaryPackage_; }
+  void removePrimaryPackage();
+
+  std::size_t getIdentificationCount() const { return identifications_.size(); }
+  std::shared_ptr<Identification> getIdentificationAt(std::size_t index);
+  std::shared_ptr<const Identification> getIdentificationAt(std::size_t index) const;
+  void addIdentification(const std::shared_ptr<Identification>& identification);
+  void insertIdentificationAt(std::size_t index, const std::shared_ptr<Identification>& identification);
+  void removeIdentificationAt(std::size_t index);
+
+  std::shared_ptr<ContentStorage> getContentStorage();
+  std::shared_ptr<const ContentStorage> getContentStorage() const;
+  void setContentStorage(const std::shared_ptr<ContentStorage>& contentStorage);
+
+  const KLVKey& getOperationalPattern() const { return operationalPattern_; }
+  void setOperationalPattern(const KLVKey& operationalPattern) { operationalPattern_ = operationalPattern; }
+  const std::vector<KLVKey>& getEssenceContainers() const { return essenceContainers_; }
+  void setEssenceContainers(const std::vector<KLVKey>& essenceContainers) { essenceContainers_ = essenceContainers; }
+  const std::vector<KLVKey>& getDMSchemes() const { return dmSchemes_; }
+  void setDMSchemes(const std::vector<KLVKey>& dmSchemes) { dmSchemes_ = dmSchemes; }
+
+private:
+  MXFTimestamp lastModifiedDate_;
+  std::uint16_t version_;
+  std::optional<std::uint32_t> objectModelVersion_;
+  std::weak_ptr<GenericPackage> primaryPackage_;
+  bool hasPrimaryPackage_ = false;
+  std::vector<std::shared_ptr<Identification>> identifications_;
+  std::shared_ptr<ContentStorage> contentStorage_;
+  KLVKey operationalPattern_;
+  std::vector<KLVKey> essenceContainers_;
+  std::vector<KLVKey> dmSchemes_;
+};
+
+class Identification : public MetadataObject {
+public:
+  // thisGenerationUID from uuid_generate, modificationDate the present UTC
+  // time.
+  Identification();
+  ~Identification() override;
+
+  static std::shared_ptr<Identification> create();
+
+  const MXFUID& getThisGenerationUID() const { return thisGenerationUID_; }
+  void setThisGenerationUID(const MXFUID& thisGenerationUID) { thisGenerationUID_ = thisGenerationUID; }
+  const std::wstring& getCompanyName() const { return companyName_; }
+  void setCompanyName(const std::wstring& companyName) { companyName_ = companyName; }
+  const std::wstring& getProductName() const { return productName_; }
+  void setProductName(const std::wstring& productName) { productName_ = productName; }
+  const MXFProductVersion& getProductVersion() const;
+  void setProductVersion(const MXFProductVersion& productVersion) { productVersion_ = productVersion; }
+  bool hasProductVersion() const { return productVersion_.has_value(); }
+  void removeProductVersion() { productVersion_.reset(); }
+  const std::wstring& getVersionString() const { return versionString_; }
+  void setVersionString(const std::wstring& versionString) { versionString_ = versionString; }
+  const MXFUID& getProductUID() const { return productUID_; }
+  void setProductUID(const MXFUID& productUID) { productUID_ = productUID; }
+  const MXFTimestamp& getModificationDate() const { return modificationDate_; }
+  void setModificationDate(const MXFTimestamp& modificationDate) { modificationDate_ = modificationDate; }
+  const MXFProductVersion& getToolkitVersion() const;
+  void setToolkitVersion(const MXFProductVersion& toolkitVersion) { toolkitVersion_ = toolkitVersion; }
+  bool hasToolkitVersion() const { return toolkitVersion_.has_value(); }
+  void removeToolkitVersion() { toolkitVersion_.reset(); }
+  const std::wstring& getPlatform() const;
+  void setPlatform(const std::wstring& platform) { platform_ = platform; }
+  bool hasPlatform() const { return platform_.has_value(); }
+  void removePlatform() { platform_.reset(); }
+
+private:
+  MXFUID thisGenerationUID_;
+  std::wstring companyName_;
+  std::wstring productName_;
+  std::optional<MXFProductVersion> productVersion_;
+  std::wstring versionString_;
+  MXFUID productUID_;
+  MXFTimestamp modificationDate_;
+  std::optional<MXFProductVersion> toolkitVersion_;
+  std::optional<std::wstring> platform_;
+};
+
+class ContentStorage : public MetadataObject {
+public:
+  ContentStorage();
+  ~ContentStorage() override;
+
+  static std::shared_ptr<ContentStorage> create();
+
+  std::size_t getPackageCount() const { return packages_.size(); }
+  std::shared_ptr<GenericPackage> getPackageAt(std::size_t index);
+  std::shared_ptr<const GenericPackage> getPackageAt(std::size_t index) const;
+  void addPackage(const std::shared_ptr<GenericPackage>& package);
+  void insertPackageAt(std::size_t index, const std::shared_ptr<GenericPackage>& package);
+  void removePackageAt(std::size_t index);
+
+  std::size_t getEssenceContainerDataCount() const { return essenceContainerData_.size(); }
+  std::shared_ptr<EssenceContainerData> getEssenceContainerDataAt(std::size_t index);
+  std::shared_ptr<const EssenceContainerData> getEssenceContainerDataAt(std::size_t index) const;
+  void addEssenceContainerData(const std::shared_ptr<EssenceContainerData>& essenceContainerData);
+  void insertEssenceContainerDataAt(std::size_t index,
+                                    const std::shared_ptr<EssenceContainerData>& essenceContainerData);
+  void removeEssenceContainerDataAt(std::size_t index);
+  bool hasEssenceContainerData() const { return hasEssenceContainerData_; }
+  // Drops the elements without releasing them.
+  void removeEssenceContainerData();
+
+private:
+  std::vector<std::shared_ptr<GenericPackage>> packages_;
+  std::vector<std::shared_ptr<EssenceContainerData>> essenceContainerData_;
+  bool hasEssenceContainerData_ = false;
+};
+
+class EssenceContainerData : public MetadataObject {
+public:
+  EssenceContainerData();
+  ~EssenceContainerData() override;
+
+  static std::shared_ptr<EssenceContainerData> create();
+
+  // Binds by package identifier, not by reference.
+  const UMID& getLinkedPackageUID() const { return linkedPackageUID_; }
+  void setLinkedPackageUID(const UMID& linkedPackageUID) { linkedPackageUID_ = linkedPackageUID; }
+  const std::uint32_t& getIndexSID() const;
+  void setIndexSID(const std::uint32_t& indexSID) { indexSID_ = indexSID; }
+  bool hasIndexSID() const { return indexSID_.has_value(); }
+  void removeIndexSID() { indexSID_.reset(); }
+  const std::uint32_t& getBodySID() const { return bodySID_; }
+  void setBodySID(const std::uint32_t& bodySID) { bodySID_ = bodySID; }
+
+private:
+  UMID linkedPackageUID_;
+  std::optional<std::uint32_t> indexSID_;
+  std::uint32_t bodySID_ = 0;
+};
+
+class GenericPackage : public MetadataObject {
+public:
+  // Both dates the present UTC time, and a new packageUID.
+  GenericPackage();
+  ~GenericPackage() override;
+
+  static std::shared_ptr<GenericPackage> create();
+
+  const UMID& getPackageUID() const { return packageUID_; }
+  void setPackageUID(const UMID& packageUID) { packageUID_ = packageUID; }
+  const std::wstring& getName() const;
+  void setName(const std::wstring& name) { name_ = name; }
+  bool hasName() const { return name_.has_value(); }
+  void removeName() { name_.reset(); }
+  const MXFTimestamp& getPackageCreationDate() const { return packageCreationDate_; }
+  void setPackageCreationDate(const MXFTimestamp& packageCreationDate) { packageCreationDate_ = packageCreationDate; }
+  const MXFTimestamp& getPackageModifiedDate() const { return packageModifiedDate_; }
+  void setPackageModifiedDate(const MXFTimestamp& packageModifiedDate) { packageModifiedDate_ = packageModifiedDate; }
+
+  std::size_t getTrackCount() const { return tracks_.size(); }
+  std::shared_ptr<Track> getTrackAt(std::size_t index);
+  std::shared_ptr<const Track> getTrackAt(std::size_t index) const;
+  void addTrack(const std::shared_ptr<Track>& track);
+  void insertTrackAt(std::size_t index, const std::shared_ptr<Track>& track);
+  void removeTrackAt(std::size_t index);
+
+private:
+  UMID packageUID_;
+  std::optional<std::wstring> name_;
+  MXFTimestamp packageCreationDate_;
+  MXFTimestamp packageModifiedDate_;
+  std::vector<std::shared_ptr<Track>> tracks_;
+};
+
+class MaterialPackage : public GenericPackage {
+public:
+  MaterialPackage();
+  ~MaterialPackage() override;
+
+  static std::shared_ptr<MaterialPackage> create();
+};
+
+class SourcePackage : public GenericPackage {
+public:
+  SourcePackage();
+  ~SourcePackage() override;
+
+  static std::shared_ptr<SourcePackage> create();
+
+  std::shared_ptr<GenericDescriptor> getDescriptor();
+  std::shared_ptr<const GenericDescriptor> getDescriptor() const;
+  void setDescriptor(const std::shared_ptr<GenericDescriptor>& descriptor);
+
+private:
+  std::shared_ptr<GenericDescriptor> descriptor_;
+};
+
+class Track : public MetadataObject {
+public:
+  Track();
+  ~Track() override;
+
+  static std::shared_ptr<Track> create();
+
+  const std::uint32_t& getTrackID() const { return trackID_; }
+  void setTrackID(const std::uint32_t& trackID) { trackID_ = trackID; }
+  const std::uint32_t& getTrackNumber() const;
+  void setTrackNumber(const std::uint32_t& trackNumber) { trackNumber_ = trackNumber; }
+  bool hasTrackNumber() const { return trackNumber_.has_value(); }
+  void removeTrackNumber() { trackNumber_.reset(); }
+  const std::wstring& getTrackName() const;
+  void setTrackName(const std::wstring& trackName) { trackName_ = trackName; }
+  bool hasTrackName() const { return trackName_.has_value(); }
+  void removeTrackName() { trackName_.reset(); }
+
+  std::shared_ptr<Segment> getSegment();
+  std::shared_ptr<const Segment> getSegment() const;
+  void setSegment(const std::shared_ptr<Segment>& segment);
+
+private:
+  std::uint32_t trackID_ = 0;
+  std::optional<std::uint32_t> trackNumber_;
+  std::optional<std::wstring> trackName_;
+  std::shared_ptr<Segment> segment_;
+};
+
+class TimelineTrack : public Track {
+public:
+  TimelineTrack();
+  ~TimelineTrack() override;
+
+  static std::shared_ptr<TimelineTrack> create();
+
+  const MXFRational& getEditRate() const { return editRate_; }
+  void setEditRate(const MXFRational& editRate) { editRate_ = editRate; }
+  const std::int64_t& getOrigin() const { return origin_; }
+  void setOrigin(const std::int64_t& origin) { origin_ = origin; }
+
+private:
+  MXFRational editRate_;
+  std::int64_t origin_ = 0;
+};
+
+class EventTrack : public Track {
+public:
+  EventTrack();
+  ~EventTrack() override;
+
+  static std::shared_ptr<EventTrack> create();
+
+  const MXFRational& getEditRate() const { return editRate_; }
+  void setEditRate(const MXFRational& editRate) { editRate_ = editRate; }
+  const std::int64_t& getOrigin() const;
+  void setOrigin(const std::int64_t& origin) { origin_ = origin; }
+  bool hasOrigin() const { return origin_.has_value(); }
+  void removeOrigin() { origin_.reset(); }
+
+private:
+  MXFRational editRate_;
+  std::optional<std::int64_t> origin_;
+};
+
+class StaticTrack : public Track {
+public:
+  StaticTrack();
+  ~StaticTrack() override;
+
+  static std::shared_ptr<StaticTrack> create();
+};
+
+class Component : public MetadataObject {
+public:
+  Component();
+  ~Component() override;
+
+  static std::shared_ptr<Component> create();
+
+  const KLVKey& getDataDefinition() const { return dataDefinition_; }
+  void setDataDefinition(const KLVKey& dataDefinition) { dataDefinition_ = dataDefinition; }
+  const std::int64_t& getDuration() const;
+  void setDuration(const std::int64_t& duration) { duration_ = duration; }
+  bool hasDuration() const { return duration_.has_value(); }
+  void removeDuration() { duration_.reset(); }
+
+private:
+  KLVKey dataDefinition_;
+  std::optional<std::int64_t> duration_;
+};
+
+class Segment : public Component {
+public:
+  Segment();
+  ~Segment() override;
+
+  static std::shared_ptr<Segment> create();
+};
+
+class Sequence : public Segment {
+public:
+  Sequence();
+  ~Sequence() override;
+
+  static std::shared_ptr<Sequence> create();
+
+  std::size_t getComponentCount() const { return components_.size(); }
+  std::shared_ptr<Component> getComponentAt(std::size_t index);
+  std::shared_ptr<const Component> getComponentAt(std::size_t index) const;
+  void addComponent(const std::shared_ptr<Component>& component);
+  void insertComponentAt(std::size_t index, const std::shared_ptr<Component>& component);
+  void removeComponentAt(std::size_t index);
+
+private:
+  std::vector<std::shared_ptr<Component>> components_;
+};
+
+class SourceReference : public Segment {
+public:
+  SourceReference();
+  ~SourceReference() override;
+
+  static std::shared_ptr<SourceReference> create();
+
+  // Binds by package identifier, not by reference.
+  const UMID& getSourcePackageID() const { return sourcePackageID_; }
+  void setSourcePackageID(const UMID& sourcePackageID) { sourcePackageID_ = sourcePackageID; }
+  const std::uint32_t& getSourceTrackID() const { return sourceTrackID_; }
+  void setSourceTrackID(const std::uint32_t& sourceTrackID) { sourceTrackID_ = sourceTrackID; }
+
+private:
+  UMID sourcePackageID_;
+  std::uint32_t sourceTrackID_ = 0;
+};
+
+class SourceClip : public SourceReference {
+public:
+  SourceClip();
+  ~SourceClip() override;
+
+  static std::shared_ptr<SourceClip> create();
+
+  const std::int64_t& getStartPosition() const { return startPosition_; }
+  void setStartPosition(const std::int64_t& startPosition) { startPosition_ = startPosition; }
+
+private:
+  std::int64_t startPosition_ = 0;
+};
+
+class DMSourceClip : public SourceClip {
+public:
+  DMSourceClip();
+  ~DMSourceClip() override;
+
+  static std::shared_ptr<DMSourceClip> create();
+
+  const std::vector<std::uint32_t>& getTargetTrackIDs() const;
+  void setTargetTrackIDs(const std::vector<std::uint32_t>& targetTrackIDs) { targetTrackIDs_ = targetTrackIDs; }
+  bool hasTargetTrackIDs() const { return targetTrackIDs_.has_value(); }
+  void removeTargetTrackIDs() { targetTrackIDs_.reset(); }
+
+private:
+  std::optional<std::vector<std::uint32_t>> targetTrackIDs_;
+};
+
+class TimecodeComponent : public Segment {
+public:
+  TimecodeComponent();
+  ~TimecodeComponent() override;
+
+  static std::shared_ptr<TimecodeComponent> create();
+
+  const std::int64_t& getStartTimecode() const { return startTimecode_; }
+  void setStartTimecode(const std::int64_t& startTimecode) { startTimecode_ = startTimecode; }
+  const std::uint16_t& getRoundedTimecodeBase() const { return roundedTimecodeBase_; }
+  void setRoundedTimecodeBase(const std::uint16_t& roundedTimecodeBase) { roundedTimecodeBase_ = roundedTimecodeBase; }
+  const bool& getDropFrame() const { return dropFrame_; }
+  void setDropFrame(const bool& dropFrame) { dropFrame_ = dropFrame; }
+
+private:
+  std::int64_t startTimecode_ = 0;
+  std::uint16_t roundedTimecodeBase_ = 0;
+  bool dropFrame_ = false;
+};
+
+class Event : public Segment {
+public:
+  Event();
+  ~Event() override;
+
+  static std::shared_ptr<Event> create();
+
+  const std::int64_t& getPosition() const;
+  void setPosition(const std::int64_t& position) { position_ = position; }
+  bool hasPosition() const { return position_.has_value(); }
+  void removePosition() { position_.reset(); }
+  const std::wstring& getComment() const;
+  void setComment(const std::wstring& comment) { comment_ = comment; }
+  bool hasComment() const { return comment_.has_value(); }
+  void removeComment() { comment_.reset(); }
+
+private:
+  std::optional<std::int64_t> position_;
+  std::optional<std::wstring> comment_;
+};
+
+class CommentMarker : public Event {
+public:
+  CommentMarker();
+  ~CommentMarker() override;
+
+  static std::shared_ptr<CommentMarker> create();
+
+  std::shared_ptr<SourceReference> getAnnotation();
+  std::shared_ptr<const SourceReference> getAnnotation() const;
+  void setAnnotation(const std::shared_ptr<SourceReference>& annotation);
+  bool hasAnnotation() const { return annotation_ != nullptr; }
+  // Drops the object without releasing it.
+  void removeAnnotation() { annotation_.reset(); }
+
+private:
+  std::shared_ptr<SourceReference> annotation_;
+};
+
+class DMSegment : public CommentMarker {
+public:
+  DMSegment();
+  ~DMSegment() override;
+
+  static std::shared_ptr<DMSegment> create();
+
+  const std::vector<std::uint32_t>& getTargetTrackIDs() const;
+  void setTargetTrackIDs(const std::vector<std::uint32_t>& targetTrackIDs) { targetTrackIDs_ = targetTrackIDs; }
+  bool hasTargetTrackIDs() const { return targetTrackIDs_.has_value(); }
+  void removeTargetTrackIDs() { targetTrackIDs_.reset(); }
+
+  std::shared_ptr<DescriptiveMetadataFramework> getDMFramework();
+  std::shared_ptr<const DescriptiveMetadataFramework> getDMFramework() const;
+  void setDMFramework(const std::shared_ptr<DescriptiveMetadataFramework>& dmFramework);
+  bool hasDMFramework() const { return dmFramework_ != nullptr; }
+  // Drops the object without releasing it.
+  void removeDMFramework() { dmFramework_.reset(); }
+
+private:
+  std::optional<std::vector<std::uint32_t>> targetTrackIDs_;
+  std::shared_ptr<DescriptiveMetadataFramework> dmFramework_;
+};
+
+// The bases of the descriptive metadata schemes.
+class DescriptiveMetadataFramework : public MetadataObject {
+public:
+  DescriptiveMetadataFramework();
+  ~DescriptiveMetadataFramework() override;
+
+  static std::shared_ptr<DescriptiveMetadataFramework> create();
+};
+
+class DescriptiveMetadataObject : public MetadataObject {
+public:
+  DescriptiveMetadataObject();
+  ~DescriptiveMetadataObject() override;
+
+  static std::shared_ptr<DescriptiveMetadataObject> create();
+};
+
+// Their factories. Those of Component, Segment, GenericPackage, Track and the
+// two descriptive bases serve as bases only: no composite registers them.
+class PrefaceFactory : public MetadataClassFactory<Preface, MetadataObjectFactory> {};
+class IdentificationFactory : public MetadataClassFactory<Identification, MetadataObjectFactory> {};
+class ContentStorageFactory : public MetadataClassFactory<ContentStorage, MetadataObjectFactory> {};
+class EssenceContainerDataFactory : public MetadataClassFactory<EssenceContainerData, MetadataObjectFactory> {};
+class GenericPackageFactory : public MetadataClassFactory<GenericPackage, MetadataObjectFactory> {};
+class MaterialPackageFactory : public MetadataClassFactory<MaterialPackage, GenericPackageFactory> {};
+class SourcePackageFactory : public MetadataClassFactory<SourcePackage, GenericPackageFactory> {};
+class TrackFactory : public MetadataClassFactory<Track, MetadataObjectFactory> {};
+class TimelineTrackFactory : public MetadataClassFactory<TimelineTrack, TrackFactory> {};
+class EventTrackFactory : public MetadataClassFactory<EventTrack, TrackFactory> {};
+class StaticTrackFactory : public MetadataClassFactory<StaticTrack, TrackFactory> {};
+class ComponentFactory : public MetadataClassFactory<Component, MetadataObjectFactory> {};
+class SegmentFactory : public MetadataClassFactory<Segment, ComponentFactory> {};
+class SequenceFactory : public MetadataClassFactory<Sequence, SegmentFactory> {};
+class SourceReferenceFactory : public MetadataClassFactory<SourceReference, SegmentFactory> {};
+class SourceClipFactory : public MetadataClassFactory<SourceClip, SourceReferenceFactory> {};
+class DMSourceClipFactory : public MetadataClassFactory<DMSourceClip, SourceClipFactory> {};
+class TimecodeComponentFactory : public MetadataClassFactory<TimecodeComponent, SegmentFactory> {};
+class EventFactory : public MetadataClassFactory<Event, SegmentFactory> {};
+class CommentMarkerFactory : public MetadataClassFactory<CommentMarker, EventFactory> {};
+class DMSegmentFactory : public MetadataClassFactory<DMSegment, CommentMarkerFactory> {};
+class DescriptiveMetadataFrameworkFactory
+    : public MetadataClassFactory<DescriptiveMetadataFramework, MetadataObjectFactory> {};
+class DescriptiveMetadataObjectFactory
+    : public MetadataClassFactory<DescriptiveMetadataObject, MetadataObjectFactory> {};
 
 // ---------------------------------------------------------------------------
 // Locators and descriptors
 
+// Where essence outside the file is to be found.
+class GenericLocator : public MetadataObject {
+public:
+  GenericLocator();
+  ~GenericLocator() override;
+
+  static std::shared_ptr<GenericLocator> create();
+};
+
+class NetworkLocator : public GenericLocator {
+public:
+  NetworkLocator();
+  ~NetworkLocator() override;
+
+  static std::shared_ptr<NetworkLocator> create();
+
+  const std::wstring& getURLString() const { return urlString_; }
+  void setURLString(const std::wstring& urlString) { urlString_ = urlString; }
+
+private:
+  std::wstring urlString_;
+};
+
+class TextLocator : public GenericLocator {
+public:
+  TextLocator();
+  ~TextLocator() override;
+
+  static std::shared_ptr<TextLocator> create();
+
+  const std::wstring& getLocatorName() const { return locatorName_; }
+  void setLocatorName(const std::wstring& locatorName) { locatorName_ = locatorName; }
+
+private:
+  std::wstring locatorName_;
+};
+
+class GenericLocatorFactory : public MetadataClassFactory<GenericLocator, MetadataObjectFactory> {};
+class NetworkLocatorFactory : public MetadataClassFactory<NetworkLocator, GenericLocatorFactory> {};
+class TextLocatorFactory : public MetadataClassFactory<TextLocator, GenericLocatorFactory> {};
+
+// Eight pairs of a component code and its depth in bits, kept as they stand
+// in the file: exactly 16 octets.
+struct RGBALayout {
+  struct Component {
+    std::uint8_t code = 0;
+    std::uint8_t depth = 0;
+    bool operator==(const Component& o) const { return code == o.code && depth == o.depth; }
+    bool operator!=(const Component& o) const { return !(*this == o); }
+  };
+
+  std::array<Component, 8> components{};
+  bool operator==(const RGBALayout& o) const { return components == o.components; }
+  bool operator!=(const RGBALayout& o) const { return !(*this == o); }
+};
+
+// A further description that hangs under a descriptor.
+class SubDescriptor : public MetadataObject {
+public:
+  SubDescriptor();
+  ~SubDescriptor() override;
+
+  static std::shared_ptr<SubDescriptor> create();
+};
+
+class ContainerConstraintsSubDescriptor : public SubDescriptor {
+public:
+  ContainerConstraintsSubDescriptor();
+  ~ContainerConstraintsSubDescriptor() override;
+
+  static std::shared_ptr<ContainerConstraintsSubDescriptor> create();
+};
+
+// The base of the essence descriptors: locators and sub-descriptors, both
+// optional vectors that the descriptor owns.
+class GenericDescriptor : public MetadataObject {
+public:
+  GenericDescriptor();
+  ~GenericDescriptor() override;
+
+  static std::shared_ptr<GenericDescriptor> create();
+
+  std::size_t getLocatorCount() const { return locators_.size(); }
+  std::shared_ptr<GenericLocator> getLocatorAt(std::size_t index);
+  std::shared_ptr<const GenericLocator> getLocatorAt(std::size_t index) const;
+  void addLocator(const std::shared_ptr<GenericLocator>& locator);
+  void insertLocatorAt(std::size_t index, const std::shared_ptr<GenericLocator>& locator);
+  void removeLocatorAt(std::size_t index);
+  bool hasLocators() const { return hasLocators_; }
+  // Drops the locators without releasing them.
+  void removeLocators();
+
+  std::size_t getGenericSubDescriptorCount() const { return genericSubDescriptors_.size(); }
+  std::shared_ptr<SubDescriptor> getGenericSubDescriptorAt(std::size_t index);
+  std::shared_ptr<const SubDescriptor> getGenericSubDescriptorAt(std::size_t index) const;
+  void addGenericSubDescriptor(const std::shared_ptr<SubDescriptor>& subDescriptor);
+  void insertGenericSubDescriptorAt(std::size_t index, const std::shared_ptr<SubDescriptor>& subDescriptor);
+  void removeGenericSubDescriptorAt(std::size_t index);
+  bool hasGenericSubDescriptors() const { return hasGenericSubDescriptors_; }
+  // Drops the sub-descriptors without releasing them.
+  void removeGenericSubDescriptors();
+
+private:
+  std::vector<std::shared_ptr<GenericLocator>> locators_;
+  bool hasLocators_ = false;
+  std::vector<std::shared_ptr<SubDescriptor>> genericSubDescriptors_;
+  bool hasGenericSubDescriptors_ = false;
+};
+
+class FileDescriptor : public GenericDescriptor {
+public:
+  FileDescriptor();
+  ~FileDescriptor() override;
+
+  static std::shared_ptr<FileDescriptor> create();
+
+  const std::uint32_t& getLinkedTrackID() const;
+  void setLinkedTrackID(const std::uint32_t& linkedTrackID) { linkedTrackID_ = linkedTrackID; }
+  bool hasLinkedTrackID() const { return linkedTrackID_.has_value(); }
+  void removeLinkedTrackID() { linkedTrackID_.reset(); }
+
+  const MXFRational& getSampleRate() const { return sampleRate_; }
+  void setSampleRate(const MXFRational& sampleRate) { sampleRate_ = sampleRate; }
+
+  const std::int64_t& getContainerDuration() const;
+  void setContainerDuration(const std::int64_t& containerDuration) { containerDuration_ = containerDuration; }
+  bool hasContainerDuration() const { return containerDuration_.has_value(); }
+  void removeContainerDuration() { containerDuration_.reset(); }
+
+  const KLVKey& getEssenceContainer() const { return essenceContainer_; }
+  void setEssenceContainer(const KLVKey& essenceContainer) { essenceContainer_ = essenceContainer; }
+
+  const MXFUID& getCodec() const;
+  void setCodec(const MXFUID& codec) { codec_ = codec; }
+  bool hasCodec() const { return codec_.has_value(); }
+  void removeCodec() { codec_.reset(); }
+
+private:
+  std::optional<std::uint32_t> linkedTrackID_;
+  MXFRational sampleRate_;
+  std::optional<std::int64_t> containerDuration_;
+  KLVKey essenceContainer_;
+  std::optional<MXFUID> codec_;
+};
+
+class PictureDescriptor : public FileDescriptor {
+public:
+  PictureDescriptor();
+  ~PictureDescriptor() override;
+
+  static std::shared_ptr<PictureDescriptor> create();
+
+  const std::uint8_t& getSignalStandard() const;
+  void setSignalStandard(const std::uint8_t& signalStandard) { signalStandard_ = signalStandard; }
+  bool hasSignalStandard() const { return signalStandard_.has_value(); }
+  void removeSignalStandard() { signalStandard_.reset(); }
+
+  const std::uint8_t& getFrameLayout() const { return frameLayout_; }
+  void setFrameLayout(const std::uint8_t& frameLayout) { frameLayout_ = frameLayout; }
+
+  const std::uint32_t& getStoredWidth() const { return storedWidth_; }
+  void setStoredWidth(const std::uint32_t& storedWidth) { storedWidth_ = storedWidth; }
+
+  const std::uint32_t& getStoredHeight() const { return storedHeight_; }
+  void setStoredHeight(const std::uint32_t& storedHeight) { storedHeight_ = storedHeight; }
+
+  const std::int32_t& getStoredF2Offset() const;
+  void setStoredF2Offset(const std::int32_t& storedF2Offset) { storedF2Offset_ = storedF2Offset; }
+  bool hasStoredF2Offset() const { return storedF2Offset_.has_value(); }
+  void removeStoredF2Offset() { storedF2Offset_.reset(); }
+
+  const std::uint32_t& getSampledWidth() const;
+  void setSampledWidth(const std::uint32_t& sampledWidth) { sampledWidth_ = sampledWidth; }
+  bool hasSampledWidth() const { return sampledWidth_.has_value(); }
+  void removeSampledWidth() { sampledWidth_.reset(); }
+
+  const std::uint32_t& getSampledHeight() const;
+  void setSampledHeight(const std::uint32_t& sampledHeight) { sampledHeight_ = sampledHeight; }
+  bool hasSampledHeight() const { return sampledHeight_.has_value(); }
+  void removeSampledHeight() { sampledHeight_.reset(); }
+
+  const std::int32_t& getSampledXOffset() const;
+  void setSampledXOffset(const std::int32_t& sampledXOffset) { sampledXOffset_ = sampledXOffset; }
+  bool hasSampledXOffset() const { return sampledXOffset_.has_value(); }
+  void removeSampledXOffset() { sampledXOffset_.reset(); }
+
+  const std::int32_t& getSampledYOffset() const;
+  void setSampledYOffset(const std::int32_t& sampledYOffset) { sampledYOffset_ = sampledYOffset; }
+  bool hasSampledYOffset() const { return sampledYOffset_.has_value(); }
+  void removeSampledYOffset() { sampledYOffset_.reset(); }
+
+  const std::uint32_t& getDisplayHeight() const;
+  void setDisplayHeight(const std::uint32_t& displayHeight) { displayHeight_ = displayHeight; }
+  bool hasDisplayHeight() const { return displayHeight_.has_value(); }
+  void removeDisplayHeight() { displayHeight_.reset(); }
+
+  const std::uint32_t& getDisplayWidth() const;
+  void setDisplayWidth(const std::uint32_t& displayWidth) { displayWidth_ = displayWidth; }
+  bool hasDisplayWidth() const { return displayWidth_.has_value(); }
+  void removeDisplayWidth() { displayWidth_.reset(); }
+
+  const std::int32_t& getDisplayXOffset() const;
+  void setDisplayXOffset(const std::int32_t& displayXOffset) { displayXOffset_ = displayXOffset; }
+  bool hasDisplayXOffset() const { return displayXOffset_.has_value(); }
+  void removeDisplayXOffset() { displayXOffset_.reset(); }
+
+  const std::int32_t& getDisplayYOffset() const;
+  void setDisplayYOffset(const std::int32_t& displayYOffset) { displayYOffset_ = displayYOffset; }
+  bool hasDisplayYOffset() const { return displayYOffset_.has_value(); }
+  void removeDisplayYOffset() { displayYOffset_.reset(); }
+
+  const std::int32_t& getDisplayF2Offset() const;
+  void setDisplayF2Offset(const std::int32_t& displayF2Offset) { displayF2Offset_ = displayF2Offset; }
+  bool hasDisplayF2Offset() const { return displayF2Offset_.has_value(); }
+  void removeDisplayF2Offset() { displayF2Offset_.reset(); }
+
+  const MXFRational& getAspectRatio() const { return aspectRatio_; }
+  void setAspectRatio(const MXFRational& aspectRatio) { aspectRatio_ = aspectRatio; }
+
+  const std::uint8_t& getActiveFormatDescriptor() const;
+  void setActiveFormatDescriptor(const std::uint8_t& activeFormatDescriptor) {
+    activeFormatDescriptor_ = activeFormatDescriptor;
+  }
+  bool hasActiveFormatDescriptor() const { return activeFormatDescriptor_.has_value(); }
+  void removeActiveFormatDescriptor() { activeFormatDescriptor_.reset(); }
+
+  const std::vector<std::int32_t>& getVideoLineMap() const { return videoLineMap_; }
+  void setVideoLineMap(const std::vector<std::int32_t>& videoLineMap) { videoLineMap_ = videoLineMap; }
+
+  const std::uint8_t& getAlphaTransparency() const;
+  void setAlphaTransparency(const std::uint8_t& alphaTransparency) { alphaTransparency_ = alphaTransparency; }
+  bool hasAlphaTransparency() const { return alphaTransparency_.has_value(); }
+  void removeAlphaTransparency() { alphaTransparency_.reset(); }
+
+  const KLVKey& getCaptureGamma() const;
+  void setCaptureGamma(const KLVKey& captureGamma) { captureGamma_ = captureGamma; }
+  bool hasCaptureGamma() const { return captureGamma_.has_value(); }
+  void removeCaptureGamma() { captureGamma_.reset(); }
+
+  const std::uint32_t& getImageAlignmentOffset() const;
+  void setImageAlignmentOffset(const std::uint32_t& imageAlignmentOffset) {
+    imageAlignmentOffset_ = imageAlignmentOffset;
+  }
+  bool hasImageAlignmentOffset() const { return imageAlignmentOffset_.has_value(); }
+  void removeImageAlignmentOffset() { imageAlignmentOffset_.reset(); }
+
+  const std::uint32_t& getImageStartOffset() const;
+  void setImageStartOffset(const std::uint32_t& imageStartOffset) { imageStartOffset_ = imageStartOffset; }
+  bool hasImageStartOffset() const { return imageStartOffset_.has_value(); }
+  void removeImageStartOffset() { imageStartOffset_.reset(); }
+
+  const std::uint32_t& getImageEndOffset() const;
+  void setImageEndOffset(const std::uint32_t& imageEndOffset) { imageEndOffset_ = imageEndOffset; }
+  bool hasImageEndOffset() const { return imageEndOffset_.has_value(); }
+  void removeImageEndOffset() { imageEndOffset_.reset(); }
+
+  const std::uint8_t& getFieldDominance() const;
+  void setFieldDominance(const std::uint8_t& fieldDominance) { fieldDominance_ = fieldDominance; }
+  bool hasFieldDominance() const { return fieldDominance_.has_value(); }
+  void removeFieldDominance() { fieldDominance_.reset(); }
+
+  const KLVKey& getPictureEssenceCoding() const;
+  void setPictureEssenceCoding(const KLVKey& pictureEssenceCoding) { pictureEssenceCoding_ = pictureEssenceCoding; }
+  bool hasPictureEssenceCoding() const { return pictureEssenceCoding_.has_value(); }
+  void removePictureEssenceCoding() { pictureEssenceCoding_.reset(); }
+
+  const KLVKey& getCodingEquations() const;
+  void setCodingEquations(const KLVKey& codingEquations) { codingEquations_ = codingEquations; }
+  bool hasCodingEquations() const { return codingEquations_.has_value(); }
+  void removeCodingEquations() { codingEquations_.reset(); }
+
+  const KLVKey& getColourPrimaries() const;
+  void setColourPrimaries(const KLVKey& colourPrimaries) { colourPrimaries_ = colourPrimaries; }
+  bool hasColourPrimaries() const { return colourPrimaries_.has_value(); }
+  void removeColourPrimaries() { colourPrimaries_.reset(); }
+
+private:
+  std::optional<std::uint8_t> signalStandard_;
+  std::uint8_t frameLayout_ = 0;
+  std::uint32_t storedWidth_ = 0;
+  std::uint32_t storedHeight_ = 0;
+  std::optional<std::int32_t> storedF2Offset_;
+  std::optional<std::uint32_t> sampledWidth_;
+  std::optional<std::uint32_t> sampledHeight_;
+  std::optional<std::int32_t> sampledXOffset_;
+  std::optional<std::int32_t> sampledYOffset_;
+  std::optional<std::uint32_t> displayHeight_;
+  std::optional<std::uint32_t> displayWidth_;
+  std::optional<std::int32_t> displayXOffset_;
+  std::optional<std::int32_t> displayYOffset_;
+  std::optional<std::int32_t> displayF2Offset_;
+  MXFRational aspectRatio_;
+  std::optional<std::uint8_t> activeFormatDescriptor_;
+  std::vector<std::int32_t> videoLineMap_;
+  std::optional<std::uint8_t> alphaTransparency_;
+  std::optional<KLVKey> captureGamma_;
+  std::optional<std::uint32_t> imageAlignmentOffset_;
+  std::optional<std::uint32_t> imageStartOffset_;
+  std::optional<std::uint32_t> imageEndOffset_;
+  std::optional<std::uint8_t> fieldDominance_;
+  std::optional<KLVKey> pictureEssenceCoding_;
+  std::optional<KLVKey> codingEquations_;
+  std::optional<KLVKey> colourPrimaries_;
+};
+
+// Colour difference component pictures.
+class CDCIPictureDescriptor : public PictureDescriptor {
+public:
+  CDCIPictureDescriptor();
+  ~CDCIPictureDescriptor() override;
+
+  static std::shared_ptr<CDCIPictureDescriptor> create();
+
+  const std::uint32_t& getComponentDepth() const { return componentDepth_; }
+  void setComponentDepth(const std::uint32_t& componentDepth) { componentDepth_ = componentDepth; }
+
+  const std::uint32_t& getHorizontalSubsampling() const { return horizontalSubsampling_; }
+  void setHorizontalSubsampling(const std::uint32_t& horizontalSubsampling) {
+    horizontalSubsampling_ = horizontalSubsampling;
+  }
+
+  const std::uint32_t& getVerticalSubsampling() const;
+  void setVerticalSubsampling(const std::uint32_t& verticalSubsampling) { verticalSubsampling_ = verticalSubsampling; }
+  bool hasVerticalSubsampling() const { return verticalSubsampling_.has_value(); }
+  void removeVerticalSubsampling() { verticalSubsampling_.reset(); }
+
+  const std::uint8_t& getColourSiting() const;
+  void setColourSiting(const std::uint8_t& colourSiting) { colourSiting_ = colourSiting; }
+  bool hasColourSiting() const { return colourSiting_.has_value(); }
+  void removeColourSiting() { colourSiting_.reset(); }
+
+  const bool& getReversedByteOrder() const;
+  void setReversedByteOrder(const bool& reversedByteOrder) { reversedByteOrder_ = reversedByteOrder; }
+  bool hasReversedByteOrder() const { return reversedByteOrder_.has_value(); }
+  void removeReversedByteOrder() { reversedByteOrder_.reset(); }
+
+  const std::int16_t& getPaddingBits() const;
+  void setPaddingBits(const std::int16_t& paddingBits) { paddingBits_ = paddingBits; }
+  bool hasPaddingBits() const { return paddingBits_.has_value(); }
+  void removePaddingBits() { paddingBits_.reset(); }
+
+  const std::uint32_t& getAlphaSamplingDepth() const;
+  void setAlphaSamplingDepth(const std::uint32_t& alphaSamplingDepth) { alphaSamplingDepth_ = alphaSamplingDepth; }
+  bool hasAlphaSamplingDepth() const { return alphaSamplingDepth_.has_value(); }
+  void removeAlphaSamplingDepth() { alphaSamplingDepth_.reset(); }
+
+  const std::uint32_t& getBlackReferenceLevel() const;
+  void setBlackReferenceLevel(const std::uint32_t& blackReferenceLevel) { blackReferenceLevel_ = blackReferenceLevel; }
+  bool hasBlackReferenceLevel() const { return blackReferenceLevel_.has_value(); }
+  void removeBlackReferenceLevel() { blackReferenceLevel_.reset(); }
+
+  const std::uint32_t& getWhiteReferenceLevel() const;
+  void setWhiteReferenceLevel(const std::uint32_t& whiteReferenceLevel) { whiteReferenceLevel_ = whiteReferenceLevel; }
+  bool hasWhiteReferenceLevel() const { return whiteReferenceLevel_.has_value(); }
+  void removeWhiteReferenceLevel() { whiteReferenceLevel_.reset(); }
+
+  const std::uint32_t& getColourRange() const;
+  void setColourRange(const std::uint32_t& colourRange) { colourRange_ = colourRange; }
+  bool hasColourRange() const { return colourRange_.has_value(); }
+  void removeColourRange() { colourRange_.reset(); }
+
+private:
+  std::uint32_t componentDepth_ = 0;
+  std::uint32_t horizontalSubsampling_ = 0;
+  std::optional<std::uint32_t> verticalSubsampling_;
+  std::optional<std::uint8_t> colourSiting_;
+  std::optional<bool> reversedByteOrder_;
+  std::optional<std::int16_t> paddingBits_;
+  std::optional<std::uint32_t> alphaSamplingDepth_;
+  std::optional<std::uint32_t> blackReferenceLevel_;
+  std::optional<std::uint32_t> whiteReferenceLevel_;
+  std::optional<std::uint32_t> colourRange_;
+};
+
+// Component pictures, red, green, blue and alpha.
+class RGBAPictureDescriptor : public PictureDescriptor {
+public:
+  RGBAPictureDescriptor();
+  ~RGBAPictureDescriptor() override;
+
+  static std::shared_ptr<RGBAPictureDescriptor> create();
+
+  const std::uint32_t& getComponentMaxReferenceLevel() const;
+  void setComponentMaxReferenceLevel(const std::uint32_t& level) { componentMaxReferenceLevel_ = level; }
+  bool hasComponentMaxReferenceLevel() const { return componentMaxReferenceLevel_.has_value(); }
+  void removeComponentMaxReferenceLevel() { componentMaxReferenceLevel_.reset(); }
+
+  const std::uint32_t& getComponentMinReferenceLevel() const;
+  void setComponentMinReferenceLevel(const std::uint32_t& level) { componentMinReferenceLevel_ = level; }
+  bool hasComponentMinReferenceLevel() const { return componentMinReferenceLevel_.has_value(); }
+  void removeComponentMinReferenceLevel() { componentMinReferenceLevel_.reset(); }
+
+  const std::uint32_t& getAlphaMaxReferenceLevel() const;
+  void setAlphaMaxReferenceLevel(const std::uint32_t& level) { alphaMaxReferenceLevel_ = level; }
+  bool hasAlphaMaxReferenceLevel() const { return alphaMaxReferenceLevel_.has_value(); }
+  void removeAlphaMaxReferenceLevel() { alphaMaxReferenceLevel_.reset(); }
+
+  const std::uint32_t& getAlphaMinReferenceLevel() const;
+  void setAlphaMinReferenceLevel(const std::uint32_t& level) { alphaMinReferenceLevel_ = level; }
+  bool hasAlphaMinReferenceLevel() const { return alphaMinReferenceLevel_.has_value(); }
+  void removeAlphaMinReferenceLevel() { alphaMinReferenceLevel_.reset(); }
+
+  const std::uint8_t& getScanningDirection() const;
+  void setScanningDirection(const std::uint8_t& scanningDirection) { scanningDirection_ = scanningDirection; }
+  bool hasScanningDirection() const { return scanningDirection_.has_value(); }
+  void removeScanningDirection() { scanningDirection_.reset(); }
+
+  const RGBALayout& getPixelLayout() const { return pixelLayout_; }
+  void setPixelLayout(const RGBALayout& pixelLayout) { pixelLayout_ = pixelLayout; }
+
+  const ByteVector& getPalette() const;
+  void setPalette(const ByteVector& palette) { palette_ = palette; }
+  bool hasPalette() const { return palette_.has_value(); }
+  void removePalette() { palette_.reset(); }
+
+  const RGBALayout& getPaletteLayout() const;
+  void setPaletteLayout(const RGBALayout& paletteLayout) { paletteLayout_ = paletteLayout; }
+  bool hasPaletteLayout() const { return paletteLayout_.has_value(); }
+  void removePaletteLayout() { paletteLayout_.reset(); }
+
+private:
+  std::optional<std::uint32_t> componentMaxReferenceLevel_;
+  std::optional<std::uint32_t> componentMinReferenceLevel_;
+  std::optional<std::uint32_t> alphaMaxReferenceLevel_;
+  std::optional<std::uint32_t> alphaMinReferenceLevel_;
+  std::optional<std::uint8_t> scanningDirection_;
+  RGBALayout pixelLayout_;
+  std::optional<ByteVector> palette_;
+  std::optional<RGBALayout> paletteLayout_;
+};
+
+class SoundDescriptor : public FileDescriptor {
+public:
+  // The audio sampling rate starts at 0/1.
+  SoundDescriptor();
+  ~SoundDescriptor() override;
+
+  static std::shared_ptr<SoundDescriptor> create();
+
+  const MXFRational& getAudioSamplingRate() const { return audioSamplingRate_; }
+  void setAudioSamplingRate(const MXFRational& audioSamplingRate) { audioSamplingRate_ = audioSamplingRate; }
+
+  const bool& getLocked() const { return locked_; }
+  void setLocked(const bool& locked) { locked_ = locked; }
+
+  const std::int8_t& getAudioReferenceLevel() const;
+  void setAudioReferenceLevel(const std::int8_t& audioReferenceLevel) { audioReferenceLevel_ = audioReferenceLevel; }
+  bool hasAudioReferenceLevel() const { return audioReferenceLevel_.has_value(); }
+  void removeAudioReferenceLevel() { audioReferenceLevel_.reset(); }
+
+  const std::uint8_t& getElectroSpatialFormulation() const;
+  void setElectroSpatialFormulation(const std::uint8_t& formulation) { electroSpatialFormulation_ = formulation; }
+  bool hasElectroSpatialFormulation() const { return electroSpatialFormulation_.has_value(); }
+  void removeElectroSpatialFormulation() { electroSpatialFormulation_.reset(); }
+
+  const std::uint32_t& getChannelCount() const { return channelCount_; }
+  void setChannelCount(const std::uint32_t& channelCount) { channelCount_ = channelCount; }
+
+  const std::uint32_t& getQuantizationBits() const { return quantizationBits_; }
+  void setQuantizationBits(const std::uint32_t& quantizationBits) { quantizationBits_ = quantizationBits; }
+
+  const std::int8_t& getDialNorm() const;
+  void setDialNorm(const std::int8_t& dialNorm) { dialNorm_ = dialNorm; }
+  bool hasDialNorm() const { return dialNorm_.has_value(); }
+  void removeDialNorm() { dialNorm_.reset(); }
+
+  const KLVKey& getSoundEssenceCompression() const;
+  void setSoundEssenceCompression(const KLVKey& compression) { soundEssenceCompression_ = compression; }
+  bool hasSoundEssenceCompression() const { return soundEssenceCompression_.has_value(); }
+  void removeSoundEssenceCompression() { soundEssenceCompression_.reset(); }
+
+private:
+  MXFRational audioSamplingRate_;
+  bool locked_ = false;
+  std::optional<std::int8_t> audioReferenceLevel_;
+  std::optional<std::uint8_t> electroSpatialFormulation_;
+  std::uint32_t channelCount_ = 0;
+  std::uint32_t quantizationBits_ = 0;
+  std::optional<std::int8_t> dialNorm_;
+  std::optional<KLVKey> soundEssenceCompression_;
+};
+
+class DataDescriptor : public FileDescriptor {
+public:
+  DataDescriptor();
+  ~DataDescriptor() override;
+
+  static std::shared_ptr<DataDescriptor> create();
+
+  const KLVKey& getDataEssenceCoding() const;
+  void setDataEssenceCoding(const KLVKey& dataEssenceCoding) { dataEssenceCoding_ = dataEssenceCoding; }
+  bool hasDataEssenceCoding() const { return dataEssenceCoding_.has_value(); }
+  void removeDataEssenceCoding() { dataEssenceCoding_.reset(); }
+
+private:
+  std::optional<KLVKey> dataEssenceCoding_;
+};
+
+// The descriptor of a container that interleaves several essences: one
+// file descriptor for each.
+class MultipleDescriptor : public FileDescriptor {
+public:
+  MultipleDescriptor();
+  ~MultipleDescriptor() override;
+
+  static std::shared_ptr<MultipleDescriptor> create();
+
+  std::size_t getSubDescriptorCount() const { return subDescriptors_.size(); }
+  std::shared_ptr<FileDescriptor> getSubDescriptorAt(std::size_t index);
+  std::shared_ptr<const FileDescriptor> getSubDescriptorAt(std::size_t index) const;
+  void addSubDescriptor(const std::shared_ptr<FileDescriptor>& subDescriptor);
+  void insertSubDescriptorAt(std::size_t index, const std::shared_ptr<FileDescriptor>& subDescriptor);
+  void removeSubDescriptorAt(std::size_t index);
+
+private:
+  std::vector<std::shared_ptr<FileDescriptor>> subDescriptors_;
+};
+
+class SubDescriptorFactory : public MetadataClassFactory<SubDescriptor, MetadataObjectFactory> {};
+class ContainerConstraintsSubDescriptorFactory
+    : public MetadataClassFactory<ContainerConstraintsSubDescriptor, SubDescriptorFactory> {};
+class GenericDescriptorFactory : public MetadataClassFactory<GenericDescriptor, MetadataObjectFactory> {};
+class FileDescriptorFactory : public MetadataClassFactory<FileDescriptor, GenericDescriptorFactory> {};
+class PictureDescriptorFactory : public MetadataClassFactory<PictureDescriptor, FileDescriptorFactory> {};
+class CDCIPictureDescriptorFactory : public MetadataClassFactory<CDCIPictureDescriptor, PictureDescriptorFactory> {};
+class RGBAPictureDescriptorFactory : public MetadataClassFactory<RGBAPictureDescriptor, PictureDescriptorFactory> {};
+class SoundDescriptorFactory : public MetadataClassFactory<SoundDescriptor, FileDescriptorFactory> {};
+class DataDescriptorFactory : public MetadataClassFactory<DataDescriptor, FileDescriptorFactory> {};
+class MultipleDescriptorFactory : public MetadataClassFactory<MultipleDescriptor, FileDescriptorFactory> {};
+
+// Complete picture descriptors from an essence container label, every
+// value the label implies filled in. A DV label names a kind (octet 14) and
+// a wrapping (octet 15); the Preface version decides the colour siting of
+// 625-line pictures. A D-10 label names a kind (octet 14) and a wrapping
+// (octet 15). Both fail on a label that they can't describe.
+std::shared_ptr<CDCIPictureDescriptor> createDVPictureDescriptor(const KLVKey& essenceContainer,
+                                                                 std::uint16_t prefaceVersion);
+std::shared_ptr<CDCIPictureDescriptor> createD10PictureDescriptor(const KLVKey& essenceContainer);
+
 // ---------------------------------------------------------------------------
 // The composite of the format's classes
+
+// Every class of the format that a file may hold as a set, in search order:
+// the structural classes, the locators and the descriptors. Sets of other
+// classes are dark to it.
+class MXFFormatMetadataModelFactory : public MXFMetadataModelFactory {
+public:
+  MXFFormatMetadataModelFactory();
+  ~MXFFormatMetadataModelFactory() override;
+
+  const Factories& getFactories() override;
+
+private:
+  Factories factories_;
+};
+
+// ---------------------------------------------------------------------------
+// Property descriptions
+//
+// How a client that holds only a factory can show an object: the factory's
+// code gives each property's octets under its key, and the description of
+// the key says what the octets hold.
+
+// The value types of the class tables. A batch is a counted vector; opaque
+// is a value type without a kind of its own, shown by its octets.
+enum class MXFPropertyKind {
+  uint8,
+  uint16,
+  uint32,
+  uint64,
+  int8,
+  int16,
+  int32,
+  int64,
+  boolean,
+  rational,
+  timestamp,
+  productVersion,
+  key,
+  uid,
+  umid,
+  wideString,
+  bytes,
+  uint32Batch,
+  int32Batch,
+  keyBatch,
+  rgbaLayout,
+  strongReference,
+  weakReference,
+  strongReferenceVector,
+  opaque
+};
+
+struct MXFPropertyDescription {
+  std::string name;  // class, point, property: "Track.trackID"
+  MXFPropertyKind kind;
+};
 
 #endif

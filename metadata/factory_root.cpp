@@ -29,7 +29,10 @@ void codeDarkProperty(const KLVKey& key, const MetadataRoot::DarkValue& value, M
 
 MXFMetadataFactory::~MXFMetadataFactory() = default;
 
-MetadataRootFactory::MetadataRootFactory() { setPrimer_[MXFInstanceUIDKey] = instanceUIDTag; }
+MetadataRootFactory::MetadataRootFactory() : className_("MetadataRoot") {
+  setPrimer_[MXFInstanceUIDKey] = instanceUIDTag;
+  descriptions_[MXFInstanceUIDKey] = MXFPropertyDescription{instanceUIDName, MXFPropertyKind::uid};
+}
 
 MetadataRootFactory::~MetadataRootFactory() = default;
 

@@ -6,9 +6,11 @@
 #ifndef ZELTA_METADATA_PROPERTY_TABLE_H
 #define ZELTA_METADATA_PROPERTY_TABLE_H
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <string>
+#include <type_traits>
 #include <vector>
 
 #include "metadata.h"
@@ -16,6 +18,34 @@
 namespace zelta {
 
 enum class Presence { required, optional };
+
+// The kind of a value type of the tables, so that a builder knows its
+// property's kind from the accessors that it is given.
+template <typename T>
+struct PropertyKindOf : std::integral_constant<MXFPropertyKind, MXFPropertyKind::opaque> {};
+template <MXFPropertyKind K>
+using PropertyKindIs = std::integral_constant<MXFPropertyKind, K>;
+template <> struct PropertyKindOf<std::uint8_t> : PropertyKindIs<MXFPropertyKind::uint8> {};
+template <> struct PropertyKindOf<std::uint16_t> : PropertyKindIs<MXFPropertyKind::uint16> {};
+template <> struct PropertyKindOf<std::uint32_t> : PropertyKindIs<MXFPropertyKind::uint32> {};
+template <> struct PropertyKindOf<std::uint64_t> : PropertyKindIs<MXFPropertyKind::uint64> {};
+template <> struct PropertyKindOf<std::int8_t> : PropertyKindIs<MXFPropertyKind::int8> {};
+template <> struct PropertyKindOf<std::int16_t> : PropertyKindIs<MXFPropertyKind::int16> {};
+template <> struct PropertyKindOf<std::int32_t> : PropertyKindIs<MXFPropertyKind::int32> {};
+template <> struct PropertyKindOf<std::int64_t> : PropertyKindIs<MXFPropertyKind::int64> {};
+template <> struct PropertyKindOf<bool> : PropertyKindIs<MXFPropertyKind::boolean> {};
+template <> struct PropertyKindOf<MXFRational> : PropertyKindIs<MXFPropertyKind::rational> {};
+template <> struct PropertyKindOf<MXFTimestamp> : PropertyKindIs<MXFPropertyKind::timestamp> {};
+template <> struct PropertyKindOf<MXFProductVersion> : PropertyKindIs<MXFPropertyKind::productVersion> {};
+template <> struct PropertyKindOf<KLVKey> : PropertyKindIs<MXFPropertyKind::key> {};
+template <> struct PropertyKindOf<MXFUID> : PropertyKindIs<MXFPropertyKind::uid> {};
+template <> struct PropertyKindOf<UMID> : PropertyKindIs<MXFPropertyKind::umid> {};
+template <> struct PropertyKindOf<std::wstring> : PropertyKindIs<MXFPropertyKind::wideString> {};
+template <> struct PropertyKindOf<ByteVector> : PropertyKindIs<MXFPropertyKind::bytes> {};
+template <> struct PropertyKindOf<std::vector<std::uint32_t>> : PropertyKindIs<MXFPropertyKind::uint32Batch> {};
+template <> struct PropertyKindOf<std::vector<std::int32_t>> : PropertyKindIs<MXFPropertyKind::int32Batch> {};
+template <> struct PropertyKindOf<std::vector<KLVKey>> : PropertyKindIs<MXFPropertyKind::keyBatch> {};
+template <> struct PropertyKindOf<RGBALayout> : PropertyKindIs<MXFPropertyKind::rgbaLayout> {};
 
 template <typename C>
 struct PropertyDescriptor {
@@ -30,6 +60,7 @@ struct PropertyDescriptor {
   Presence presence;
   Parser parse;
   Coder code;
+  MXFPropertyKind kind;
 };
 
 template <typename C>
@@ -37,15 +68,22 @@ class PropertyTable {
 public:
   // The class name goes into the check of the object's class.
   PropertyTable(const std::string& className, std::vector<PropertyDescriptor<C>> properties)
-      : isClass_("object is a " + className), properties_(std::move(properties)) {}
+      : className_(className), isClass_("object is a " + className), properties_(std::move(properties)) {}
   // The table of a class of the format, with the key of its sets.
   PropertyTable(const std::string& className, const KLVKey& setKey, std::vector<PropertyDescriptor<C>> properties)
-      : isClass_("object is a " + className), setKey_(setKey), properties_(std::move(properties)) {}
+      : className_(className), isClass_("object is a " + className), setKey_(setKey),
+        properties_(std::move(properties)) {}
 
   const KLVKey& getSetKey() const { return setKey_; }
+  const std::string& getClassName() const { return className_; }
 
   void enterInto(MXFKeyToTagMap& setPrimer) const {
     for (const PropertyDescriptor<C>& property : properties_) setPrimer[property.key] = property.tag;
+  }
+
+  void describeInto(MXFPropertyDescriptions& descriptions) const {
+    for (const PropertyDescriptor<C>& property : properties_)
+      descriptions[property.key] = MXFPropertyDescription{property.name, property.kind};
   }
 
   // Reports what is missing or can't be read, and goes on.
@@ -81,6 +119,7 @@ public:
   }
 
 private:
+  std::string className_;
   std::string isClass_;
   KLVKey setKey_;
   std::vector<PropertyDescriptor<C>> properties_;
@@ -108,7 +147,8 @@ PropertyDescriptor<C> requiredValue(const std::string& name, const KLVKey& key, 
           [getter](const C& object, ByteVector& bytes, MXFReferencedObjects&) {
             externalize(bytes, (object.*getter)(), true);
             return true;
-          }};
+          },
+          PropertyKindOf<T>::value};
 }
 
 template <typename C, typename T>
@@ -145,7 +185,8 @@ PropertyDescriptor<C> singleReference(const std::string& name, const KLVKey& key
             if (strong) referenced.push_back(target);
             externalize(bytes, target->getInstanceUID(), true);
             return true;
-          }};
+          },
+          strong ? MXFPropertyKind::strongReference : MXFPropertyKind::weakReference};
 }
 
 template <typename C, typename V>
@@ -195,7 +236,8 @@ PropertyDescriptor<C> referenceVector(const std::string& name, const std::string
             }
             externalize(bytes, targets, true);
             return true;
-          }};
+          },
+          MXFPropertyKind::strongReferenceVector};
 }
 
 }  // namespace zelta
@@ -205,7 +247,10 @@ PropertyDescriptor<C> referenceVector(const std::string& name, const std::string
 
 template <typename C, typename Base>
 MetadataClassFactory<C, Base>::MetadataClassFactory() {
-  zelta::propertyTable<C>().enterInto(this->getSetPrimer());
+  const zelta::PropertyTable<C>& table = zelta::propertyTable<C>();
+  table.enterInto(this->getSetPrimer());
+  table.describeInto(this->describedProperties());
+  this->setClassName(table.getClassName());
 }
 
 template <typename C, typename Base>

@@ -13,7 +13,7 @@ namespace {
 using namespace zelta_info;
 
 const char* const usage =
-    "usage: zelta-info [--json] [--sets] [--index] FILE\n"
+    "usage: zelta-info [--json] [--sets] [--index] [--essence [--md5]] [--model] FILE\n"
     "       zelta-info --copy OUT FILE\n"
     "\n"
     "Reads the MXF file FILE (a run-in is skipped) and prints each partition\n"
@@ -24,11 +24,25 @@ const char* const usage =
     "\n"
     "  --json   print one JSON object instead (file, result, runIn, partitions,\n"
     "           randomIndex, metadata with --sets, index with --index,\n"
-    "           reports)\n"
+    "           essence with --essence, model with --model, reports)\n"
     "  --sets   also print the primer and the primed sets (set key, property\n"
     "           keys and sizes) of each partition's header metadata\n"
     "  --index  also print every index table segment with its fields, delta\n"
     "           entries and index entries\n"
+    "  --essence\n"
+    "           also print the edit units of the generic container with their\n"
+    "           system and essence elements (kind, key, length), and the count\n"
+    "           and bytes of the elements of each key\n"
+    "  --md5    with --essence, also the MD5 of the concatenated values of\n"
+    "           the essence elements of each key\n"
+    "  --model  also print the object model of the header metadata of the\n"
+    "           first partition that holds any, the header partition in a\n"
+    "           well-formed file, also when the header is open and the footer\n"
+    "           repeats the metadata: each object's class and instanceUID,\n"
+    "           each property with its value, strong references as the owned\n"
+    "           objects, weak ones as identifiers, and dark properties by key;\n"
+    "           objects that nothing owns follow the root; the model parser's\n"
+    "           reports join the others\n"
     "  --copy OUT\n"
     "           copy FILE to OUT element by element, through the KLV reader\n"
     "           and writer\n"
@@ -44,6 +58,12 @@ struct Options {
   std::string copyTo;
 };
 
+// The model of the first header metadata that the read met, however far
+// it went.
+void collectModel(Summary& summary, const Details& details, ErrorHandler& reports) {
+  if (details.model && !summary.metadata.empty()) summary.model = buildModel(summary.metadata.front(), reports);
+}
+
 // Reads the whole file; false when a fatal error stopped the read.
 bool readFile(std::istream& in, Summary& summary, const Details& details) {
   Reporter reporter(summary);
@@ -55,9 +75,11 @@ bool readFile(std::istream& in, Summary& summary, const Details& details) {
   MXFIndexParser indexParser(&indexCollector);
   indexParser.setErrorHandler(&reporter);
   SectionCounter metadata(summary, metadataSection,
-                          details.sets ? static_cast<KLVHandler*>(&setParser) : &skipper);
+                          details.sets || details.model ? static_cast<KLVHandler*>(&setParser) : &skipper);
   SectionCounter index(summary, indexSection, details.index ? static_cast<KLVHandler*>(&indexParser) : &skipper);
-  SectionCounter essence(summary, essenceSection, &skipper);
+  EssenceCollector essenceCollector(summary.essence, details.md5, &reporter);
+  SectionCounter essence(summary, essenceSection,
+                         details.essence ? static_cast<KLVHandler*>(&essenceCollector) : &skipper);
   StructureCollector structure(summary);
   MXFReader reader;
   reader.setSkipRunIn(true);
@@ -68,13 +90,17 @@ bool readFile(std::istream& in, Summary& summary, const Details& details) {
   reader.setErrorHandler(&reporter);
   try {
     reader.read(in);
+    essenceCollector.finish();
+    collectModel(summary, details, reporter);
     return true;
   } catch (const std::exception& e) {
+    essenceCollector.finish();
     // Fatal reports reach the error handler before they are thrown; anything
     // else is a fault that no report has named yet.
     if (summary.reports.empty() || summary.reports.back().severity != "fatal" ||
         summary.reports.back().message != e.what())
       reporter.fatalError(MXFUID(), e.what());
+    collectModel(summary, details, reporter);
     return false;
   }
 }
@@ -115,6 +141,12 @@ bool parseOptions(int argc, char** argv, Options& options) {
       options.details.sets = true;
     } else if (std::strcmp(argv[i], "--index") == 0) {
       options.details.index = true;
+    } else if (std::strcmp(argv[i], "--essence") == 0) {
+      options.details.essence = true;
+    } else if (std::strcmp(argv[i], "--md5") == 0) {
+      options.details.md5 = true;
+    } else if (std::strcmp(argv[i], "--model") == 0) {
+      options.details.model = true;
     } else if (std::strcmp(argv[i], "--copy") == 0 && i + 1 < argc) {
       options.copyTo = argv[++i];
     } else if (argv[i][0] == '-' || !options.file.empty()) {
@@ -123,7 +155,7 @@ bool parseOptions(int argc, char** argv, Options& options) {
       options.file = argv[i];
     }
   }
-  return !options.file.empty();
+  return !options.file.empty() && (options.details.essence || !options.details.md5);
 }
 
 }  // namespace

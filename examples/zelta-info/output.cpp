@@ -30,12 +30,6 @@ const char* statusName(const KLVKey& key) {
 
 const char* const sectionNames[3] = {"metadata", "index", "essence"};
 
-std::string label(const KLVKey& key) {
-  std::ostringstream out;
-  out << key;
-  return out.str();
-}
-
 std::string identifier(const MXFUID& id) {
   std::ostringstream out;
   out << std::hex << std::setfill('0');
@@ -49,22 +43,6 @@ std::string tagText(std::uint16_t tag) {
   return out.str();
 }
 
-std::string jsonString(const std::string& text) {
-  std::string out = "\"";
-  for (unsigned char c : text) {
-    if (c == '"' || c == '\\') {
-      out += '\\';
-      out += static_cast<char>(c);
-    } else if (c < 0x20) {
-      char escaped[8];
-      std::snprintf(escaped, sizeof escaped, "\\u%04x", c);
-      out += escaped;
-    } else {
-      out += static_cast<char>(c);
-    }
-  }
-  return out + "\"";
-}
 
 void printPartitionText(std::ostream& out, const Partition& p) {
   const MXFPartitionPack& k = p.pack;
@@ -190,6 +168,29 @@ void printSegmentJson(std::ostream& out, std::uint64_t partition, const MXFIndex
 
 }  // namespace
 
+std::string label(const KLVKey& key) {
+  std::ostringstream out;
+  out << key;
+  return out.str();
+}
+
+std::string jsonString(const std::string& text) {
+  std::string out = "\"";
+  for (unsigned char c : text) {
+    if (c == '"' || c == '\\') {
+      out += '\\';
+      out += static_cast<char>(c);
+    } else if (c < 0x20) {
+      char escaped[8];
+      std::snprintf(escaped, sizeof escaped, "\\u%04x", c);
+      out += escaped;
+    } else {
+      out += static_cast<char>(c);
+    }
+  }
+  return out + "\"";
+}
+
 void printText(std::ostream& out, const Summary& s, const Details& details) {
   if (s.runIn != 0) out << "run-in: " << s.runIn << " bytes\n";
   for (const Partition& p : s.partitions) printPartitionText(out, p);
@@ -200,6 +201,8 @@ void printText(std::ostream& out, const Summary& s, const Details& details) {
     for (const Metadata& m : s.metadata) printMetadataText(out, m);
   if (details.index)
     for (const Index& index : s.index) printIndexText(out, index);
+  if (details.essence) printEssenceText(out, s.essence);
+  if (details.model) printModelText(out, s.model);
 }
 
 void printJson(std::ostream& out, const std::string& file, bool fatal, const Summary& s, const Details& details) {
@@ -232,6 +235,14 @@ void printJson(std::ostream& out, const std::string& file, bool fatal, const Sum
       printMetadataJson(out, s.metadata[i]);
     }
     out << "]";
+  }
+  if (details.essence) {
+    out << ", \"essence\": ";
+    printEssenceJson(out, s.essence);
+  }
+  if (details.model) {
+    out << ", \"model\": ";
+    printModelJson(out, s.model);
   }
   out << ", \"reports\": [";
   for (std::size_t i = 0; i < s.reports.size(); ++i)

@@ -6,7 +6,9 @@
 #include <string>
 #include <vector>
 
+#include "essence.h"
 #include "klv.h"
+#include "model.h"
 #include "mxf.h"
 
 namespace zelta_info {
@@ -51,6 +53,8 @@ struct Summary {
   std::vector<MXFRandomIndexEntry> randomIndex;
   std::vector<Metadata> metadata;
   std::vector<Index> index;
+  Essence essence;
+  Model model;
   std::vector<Report> reports;
 };
 
@@ -146,7 +150,14 @@ private:
 struct Details {
   bool sets = false;
   bool index = false;
+  bool essence = false;
+  bool md5 = false;
+  bool model = false;
 };
+
+// Text forms shared by the printers.
+std::string label(const KLVKey& key);
+std::string jsonString(const std::string& text);
 
 void printText(std::ostream& out, const Summary& summary, const Details& details);
 void printJson(std::ostream& out, const std::string& file, bool fatal, const Summary& summary,

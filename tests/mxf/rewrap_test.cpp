@@ -1,8 +1,9 @@
 // Files of tests/data read through MXFReader and written again through
 // MXFWriter: header metadata as primed sets, index as segments, essence as
-// it came.
+// it came or through the generic container splitter and muxer.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <fstream>
 #include <memory>
@@ -13,6 +14,7 @@
 #include "support/mxf_primed_sets.h"
 #include "support/mxf_reports.h"
 #include "support/mxf_streams.h"
+#include "support/essence_recording.h"
 #include "support/recording.h"
 #include "support/run_program.h"
 
@@ -151,7 +153,16 @@ std::uint64_t regionSize(const Partition& partition, Code code) {
   return (needed + kag - 1) / kag * kag;
 }
 
-void writePartition(MXFWriter& writer, const Partition& partition) {
+enum class EssenceRoute { asKLV, throughGenericContainer };
+
+// The essence as edit units: the splitter's events piped into the muxer.
+void writeEditUnits(const ByteVector& essence, KLVHandler* handler) {
+  MXFGCMuxer muxer(handler);
+  MXFGCSplitter splitter(muxer.getStructureHandler(), muxer.getSystemHandler(), muxer.getEssenceHandler());
+  readThrough(essence, splitter);
+}
+
+void writePartition(MXFWriter& writer, const Partition& partition, EssenceRoute route) {
   MXFPartitionPack pack = partition.pack;
   pack.footerPartition = 0;
   pack.headerByteCount = partition.hasMetadata ? regionSize(partition, codeMetadata) : 0;
@@ -159,16 +170,21 @@ void writePartition(MXFWriter& writer, const Partition& partition) {
   writer.getStructureHandler()->startPartition(partition.key, pack, 0);
   if (partition.hasMetadata) codeMetadata(partition, writer.getMetadataHandler());
   if (partition.hasIndex) codeIndex(partition, writer.getIndexHandler());
-  if (!partition.essence.empty()) readThrough(partition.essence, *writer.getEssenceHandler());
+  if (!partition.essence.empty()) {
+    if (route == EssenceRoute::asKLV)
+      readThrough(partition.essence, *writer.getEssenceHandler());
+    else
+      writeEditUnits(partition.essence, writer.getEssenceHandler());
+  }
   writer.getStructureHandler()->endPartition(partition.key);
 }
 
-ByteVector rewrap(const Capture& original) {
+ByteVector rewrap(const Capture& original, EssenceRoute route = EssenceRoute::asKLV) {
   std::ostringstream out;
   {
     MXFWriter writer(out);
     writer.getStructureHandler()->startStream();
-    for (const Partition& partition : original.partitions) writePartition(writer, partition);
+    for (const Partition& partition : original.partitions) writePartition(writer, partition, route);
     writer.getStructureHandler()->randomIndex({});
     writer.getStructureHandler()->endStream(false);
   }
@@ -211,7 +227,41 @@ void expectSameContent(const Capture& original, const Capture& again) {
   }
 }
 
+// The edit units of a file's essence, partition by partition, with the
+// bytes of every element.
+RecordingGCHandler editUnitsOf(const Capture& capture) {
+  RecordingGCHandler units(RecordingGCHandler::take);
+  for (const Partition& partition : capture.partitions) {
+    if (partition.essence.empty()) continue;
+    MXFGCSplitter splitter(&units, &units, &units);
+    readThrough(partition.essence, splitter);
+  }
+  return units;
+}
+
 }  // namespace
+
+TEST(MXFRewrap, EssencePipedThroughSplitterAndMuxerReadsBackWithTheSameEditUnitsAndBytes) {
+  for (const char* name : rewrappedFiles) {
+    SCOPED_TRACE(name);
+    Capture original;
+    captureFile(name, original);
+    const ByteVector bytes = rewrap(original, EssenceRoute::throughGenericContainer);
+    Capture again;
+    util::vector_istream in(bytes);
+    capture(in, again);
+    EXPECT_EQ(reportLines(again.errors), std::vector<std::string>());
+    const RecordingGCHandler before = editUnitsOf(original);
+    const RecordingGCHandler after = editUnitsOf(again);
+    EXPECT_NE(std::count(before.events.begin(), before.events.end(), "startEditUnit"), 0);
+    EXPECT_EQ(after.events, before.events);
+    ASSERT_EQ(after.elements.size(), before.elements.size());
+    for (std::size_t i = 0; i < before.elements.size(); ++i) {
+      EXPECT_EQ(after.elements[i].key, before.elements[i].key);
+      EXPECT_EQ(after.elements[i].bytes, before.elements[i].bytes) << i;
+    }
+  }
+}
 
 TEST(MXFRewrap, RewrappedFilesReadBackWithoutReportsAndWithTheSameContent) {
   for (const char* name : rewrappedFiles) {

@@ -1,0 +1,169 @@
+// Reading speed of the essence path, MXFReader with MXFGCSplitter as its
+// essence delegate, on a generic container of D-10-sized picture elements,
+// against a plain read() loop over the same file.
+#include <benchmark/benchmark.h>
+
+#include <fstream>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "bench_files.h"
+#include "klv.h"
+#include "mxf.h"
+
+using zelta_bench::leastFileOctets;
+
+namespace {
+
+constexpr std::uint64_t pictureOctets = 250000;
+constexpr std::uint64_t elementOctets = 16 + 4 + pictureOctets;
+constexpr std::uint64_t frameCount = (leastFileOctets + elementOctets - 1) / elementOctets;
+
+const KLVKey pictureKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x02, 0x01, 0x01, 0x0D, 0x01,
+                                                     0x03, 0x01, 0x15, 0x01, 0x05, 0x01});
+const KLVKey op1aLabel(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x04, 0x01, 0x01, 0x01, 0x0D, 0x01,
+                                                    0x02, 0x01, 0x01, 0x01, 0x09, 0x00});
+
+// A primer pack without entries: a count of 0 and an entry size of 18.
+const ByteVector emptyPrimer{0, 0, 0, 0, 0, 0, 0, 18};
+constexpr std::uint64_t primerOctets = 16 + 4 + 8;
+
+void writePartition(MXFWriter& writer, MXFPartitionKind kind, std::uint64_t headerByteCount, std::uint32_t bodySID,
+                    const std::function<void()>& contents) {
+  MXFPartitionPack pack;
+  pack.kagSize = 1;
+  pack.headerByteCount = headerByteCount;
+  pack.bodySID = bodySID;
+  pack.operationalPattern = op1aLabel;
+  const KLVKey key = MXFPartitionPackKey(kind, MXFClosedComplete);
+  writer.getStructureHandler()->startPartition(key, pack, 0);
+  contents();
+  writer.getStructureHandler()->endPartition(key);
+}
+
+// Header partition with the primer alone, one body partition of frame-wrapped
+// pictures, footer partition and random index.
+void writeContainer(std::ostream& out) {
+  MXFWriter writer(out);
+  writer.getStructureHandler()->startStream();
+  writePartition(writer, MXFHeaderPartition, primerOctets, 0, [&] {
+    KLVHandler& metadata = *writer.getMetadataHandler();
+    metadata.startStream(true);
+    metadata.setLengthForm(0x83);
+    writeFixedLengthPack(metadata, MXFPrimerPackKey, emptyPrimer);
+    metadata.endStream(false);
+  });
+  writePartition(writer, MXFBodyPartition, 0, 1, [&] {
+    KLVHandler& essence = *writer.getEssenceHandler();
+    const std::vector<std::uint8_t> picture(pictureOctets, 0x5A);
+    essence.setLengthForm(0x83);
+    for (std::uint64_t i = 0; i < frameCount; ++i)
+      writeIndividualItem(essence, pictureKey, picture.data(), pictureOctets);
+  });
+  writePartition(writer, MXFFooterPartition, 0, 0, [] {});
+  writer.getStructureHandler()->randomIndex({});
+  writer.getStructureHandler()->endStream(false);
+}
+
+struct BenchFile {
+  std::string path;
+  std::uint64_t octets;
+};
+
+const BenchFile& benchFile() {
+  static const BenchFile file = [] {
+    const std::string path = zelta_bench::writeBenchFile("zelta_gc_read_bench.mxf", writeContainer);
+    std::ifstream in(path, std::ios::binary | std::ios::ate);
+    return BenchFile{path, static_cast<std::uint64_t>(std::streamoff(in.tellg()))};
+  }();
+  return file;
+}
+
+// Wants every picture: into a buffer of its own, or else into the splitter's.
+class PictureHandler : public DullMXFGCEssenceHandler {
+public:
+  explicit PictureHandler(bool ownBuffer) : ownBuffer_(ownBuffer) {}
+  bool startEssenceElement(const KLVKey&, std::uint64_t length, std::uint8_t*& buffer) override {
+    if (ownBuffer_) {
+      if (own_.size() < length) own_.resize(length);
+      buffer = own_.data();
+    }
+    return true;
+  }
+  void pictureElement(const KLVKey&, const std::uint8_t* data, std::uint64_t length) override {
+    benchmark::DoNotOptimize(data);
+    check(length == pictureOctets, "whole picture");
+    ++pictures;
+  }
+
+  std::uint64_t pictures = 0;
+
+private:
+  bool ownBuffer_;
+  std::vector<std::uint8_t> own_;
+};
+
+// The essence stream as KLV, without the splitter: values into a buffer of
+// the handler's own.
+class KLVPictureHandler : public DullKLVHandler {
+public:
+  bool startIndividualItem(const KLVKey&, std::uint64_t length, std::uint8_t*& buffer) override {
+    if (own_.size() < length) own_.resize(length);
+    buffer = own_.data();
+    return true;
+  }
+  void endIndividualItem(const KLVKey&) override { ++pictures; }
+  void value(const std::uint8_t* data, std::streamsize) override { benchmark::DoNotOptimize(data); }
+
+  std::uint64_t pictures = 0;
+
+private:
+  std::vector<std::uint8_t> own_;
+};
+
+template <typename Handler>
+void readEssence(benchmark::State& state, Handler& pictures, KLVHandler& essence) {
+  const BenchFile& file = benchFile();
+  std::uint64_t octets = 0;
+  std::uint64_t elements = 0;
+  for (auto _ : state) {
+    std::ifstream in(file.path, std::ios::binary);
+    pictures.pictures = 0;
+    MXFReader reader;
+    reader.setEssenceHandler(&essence);
+    reader.read(in);
+    check(pictures.pictures == frameCount, "every picture read");
+    octets += file.octets;
+    elements += pictures.pictures;
+  }
+  zelta_bench::reportThroughput(state, octets, elements);
+}
+
+void readThroughSplitter(benchmark::State& state, bool ownBuffer) {
+  PictureHandler pictures(ownBuffer);
+  MXFGCSplitter splitter(nullptr, nullptr, &pictures);
+  readEssence(state, pictures, splitter);
+}
+
+void BM_SplitterIntoHandlerBuffer(benchmark::State& state) { readThroughSplitter(state, true); }
+
+void BM_SplitterIntoOwnBuffer(benchmark::State& state) { readThroughSplitter(state, false); }
+
+void BM_ReaderIntoKLVHandlerBuffer(benchmark::State& state) {
+  KLVPictureHandler pictures;
+  readEssence(state, pictures, pictures);
+}
+
+void BM_PlainReadLoop(benchmark::State& state) {
+  zelta_bench::plainReadLoop(state, benchFile().path, benchFile().octets, elementOctets);
+}
+
+}  // namespace
+
+BENCHMARK(BM_SplitterIntoHandlerBuffer)->Unit(benchmark::kMillisecond)->UseRealTime();
+BENCHMARK(BM_PlainReadLoop)->Unit(benchmark::kMillisecond)->UseRealTime();
+BENCHMARK(BM_SplitterIntoOwnBuffer)->Unit(benchmark::kMillisecond)->UseRealTime();
+BENCHMARK(BM_ReaderIntoKLVHandlerBuffer)->Unit(benchmark::kMillisecond)->UseRealTime();
+
+BENCHMARK_MAIN();

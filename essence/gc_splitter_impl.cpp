@@ -1,0 +1,305 @@
+#include "essence/gc_splitter_impl.h"
+
+#include <algorithm>
+#include <cstring>
+#include <iomanip>
+#include <sstream>
+
+namespace {
+
+// From this length on an element is delivered only into a handler's buffer.
+constexpr std::uint64_t largestOwnBufferElement = 0x1000000;
+
+// Lengths of system items come from the file: a damaged one must not make the
+// splitter allocate what the stream never holds.
+constexpr std::uint64_t largestReservation = 65536;
+
+std::string hexMessage(const char* text, std::uint64_t value, int width) {
+  std::ostringstream message;
+  message << text << " - 0x" << std::uppercase << std::hex << std::setfill('0') << std::setw(width) << value;
+  return message.str();
+}
+
+}  // namespace
+
+MXFGCSplitterImpl::MXFGCSplitterImpl(const MXFGCSplitter& owner, MXFGCStructureHandler* structure,
+                                     MXFGCSystemHandler* system, MXFGCEssenceHandler* essence)
+    : structureHandler(structure), systemHandler(system), essenceHandler(essence), owner_(owner) {}
+
+// ---------------------------------------------------------------------------
+// Stream and edit units
+
+void MXFGCSplitterImpl::startStream(bool hasAccurateLengths) {
+  check(state_ == idle, "before start");
+  check(hasAccurateLengths, "has accurate lengths");
+  form_ = KLVNoLengthForm;
+  reportedForm_ = KLVNoLengthForm;
+  firstKey_ = KLVKey();
+  state_ = started;
+  if (structureHandler) structureHandler->start(0);
+}
+
+// Idle on every path, also when a handler throws.
+void MXFGCSplitterImpl::endStream() {
+  const bool openUnit = inEditUnit();
+  const bool open = state_ != idle;
+  state_ = idle;
+  if (!structureHandler) return;
+  if (openUnit) structureHandler->endEditUnit();
+  if (open) structureHandler->end();
+}
+
+void MXFGCSplitterImpl::setLengthForm(std::uint8_t form) {
+  if (form != 0x83 && form != 0x87)
+    report(&ErrorHandler::warning, nonStandardLengthFormId, hexMessage("non-standard BER length form", form, 2));
+  form_ = form;
+}
+
+bool MXFGCSplitterImpl::inEditUnit() const {
+  return state_ == system || state_ == essenceOnly || state_ == essenceAfterSystem;
+}
+
+bool MXFGCSplitterImpl::inEssence() const { return state_ == essenceOnly || state_ == essenceAfterSystem; }
+
+// Nothing in the stream marks an edit unit: it begins where the first key of
+// the stream comes again.
+void MXFGCSplitterImpl::editUnitBoundary(const KLVKey& key) {
+  const bool unset = std::all_of(firstKey_.octets().begin(), firstKey_.octets().end(),
+                                 [](std::uint8_t octet) { return octet == 0; });
+  if (unset) {
+    firstKey_ = key;
+    if (structureHandler) structureHandler->startEditUnit();
+    return;
+  }
+  if (key != firstKey_) return;
+  if (structureHandler) {
+    if (inEditUnit()) structureHandler->endEditUnit();
+    structureHandler->startEditUnit();
+  }
+}
+
+// ---------------------------------------------------------------------------
+// Essence elements
+
+MXFGCSplitterImpl::Kind MXFGCSplitterImpl::kindOf(const KLVKey& key) const {
+  if (owner_.isPictureKey(key)) return picture;
+  if (owner_.isSoundKey(key)) return sound;
+  if (owner_.isDataKey(key)) return data;
+  if (owner_.isCompoundKey(key)) return compound;
+  return noKind;
+}
+
+bool MXFGCSplitterImpl::startEssenceElement(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
+  if (key == KLVFillItemKey) return false;
+  if (state_ == started || state_ == system)
+    std::fill(std::begin(kinds_), std::end(kinds_), false);
+  else
+    check(inEssence(), "expected individual item");
+  editUnitBoundary(key);
+  handlerBuffer_ = nullptr;
+  handlerFill_ = 0;
+  ownBuffer_.clear();
+  wanted_ = false;
+  const Kind kind = owner_.isEssenceKey(key) ? kindOf(key) : noKind;
+  if (kind == noKind) {
+    reportKey(invalidGCElementId, "invalid GC essence element", key);
+    return false;
+  }
+  kinds_[kind] = true;
+  enterEssence(key);
+  wanted_ = offerEssence(key, length);
+  if (wanted_) buffer = handlerBuffer_ ? handlerBuffer_ : ownBuffer_.data();
+  return wanted_;
+}
+
+// A container without a system item holds one kind of element: the first
+// element of a second kind is reported once, and from then on the container
+// counts as one with a system item.
+void MXFGCSplitterImpl::enterEssence(const KLVKey& key) {
+  switch (state_) {
+    case started:
+      state_ = essenceOnly;
+      break;
+    case system:
+      state_ = essenceAfterSystem;
+      break;
+    case essenceOnly:
+      if (std::count(std::begin(kinds_), std::end(kinds_), true) == 2) {
+        reportKey(unexpectedGCElementId, "unexpected GC essence element", key);
+        state_ = essenceAfterSystem;
+      }
+      break;
+    case essenceAfterSystem:
+      break;
+    default:
+      check(false, "before GC essence element");
+  }
+}
+
+// Whether the value is to be read, and where to.
+bool MXFGCSplitterImpl::offerEssence(const KLVKey& key, std::uint64_t length) {
+  if (form_ != reportedForm_) {
+    reportedForm_ = form_;
+    if (essenceHandler) essenceHandler->essenceLengthForm(form_);
+  }
+  if (!essenceHandler || !essenceHandler->startEssenceElement(key, length, handlerBuffer_)) return false;
+  if (handlerBuffer_) {
+    handlerCapacity_ = length;
+    return true;
+  }
+  if (length >= largestOwnBufferElement) {
+    report(&ErrorHandler::error, unsupportedGCElementLengthId,
+           hexMessage("unsupported GC essence element length", length, 0));
+    deliver(key, nullptr, length);
+    return false;
+  }
+  ownBuffer_.reserve(length);
+  return true;
+}
+
+void MXFGCSplitterImpl::deliver(const KLVKey& key, const std::uint8_t* bytes, std::uint64_t length) {
+  switch (kindOf(key)) {
+    case picture:
+      essenceHandler->pictureElement(key, bytes, length);
+      break;
+    case sound:
+      essenceHandler->soundElement(key, bytes, length);
+      break;
+    case data:
+      essenceHandler->dataElement(key, bytes, length);
+      break;
+    case compound:
+      essenceHandler->compoundElement(key, bytes, length);
+      break;
+    default:
+      check(false, "valid GC essence element key");
+  }
+}
+
+void MXFGCSplitterImpl::endEssenceElement(const KLVKey& key) {
+  if (key == KLVFillItemKey) return;
+  if (state_ == started || state_ == system) return;
+  check(inEssence(), "expected individual item");
+  if (!wanted_ || !essenceHandler) return;
+  if (handlerBuffer_)
+    deliver(key, handlerBuffer_, handlerFill_);
+  else
+    deliver(key, ownBuffer_.data(), ownBuffer_.fill());
+}
+
+// The reader has usually read the value in place already.
+void MXFGCSplitterImpl::essenceValue(const std::uint8_t* bytes, std::streamsize size) {
+  if (!handlerBuffer_) {
+    ownBuffer_.append(bytes, size);
+    return;
+  }
+  check(size >= 0 && static_cast<std::uint64_t>(size) <= handlerCapacity_ - handlerFill_,
+        "valid essence buffer size");
+  if (bytes != handlerBuffer_ + handlerFill_)
+    std::memmove(handlerBuffer_ + handlerFill_, bytes, static_cast<std::size_t>(size));
+  handlerFill_ += static_cast<std::uint64_t>(size);
+}
+
+// ---------------------------------------------------------------------------
+// System elements
+
+bool MXFGCSplitterImpl::startSystemElement(const KLVKey& key, const char* expected) {
+  check(state_ != idle, expected);
+  editUnitBoundary(key);
+  localItems_.clear();
+  fixedPack_.clear();
+  variableItems_.clear();
+  filling_ = nullptr;
+  wanted_ = false;
+  if (!owner_.isSystemKey(key)) {
+    reportKey(invalidGCElementId, "invalid GC system element", key);
+    return false;
+  }
+  enterSystem(key);
+  wanted_ = systemHandler && systemHandler->startSystemElement(key);
+  return wanted_;
+}
+
+void MXFGCSplitterImpl::enterSystem(const KLVKey& key) {
+  switch (state_) {
+    case started:
+    case system:
+    case essenceAfterSystem:
+      break;
+    case essenceOnly:
+      reportKey(unexpectedGCElementId, "unexpected GC system element", key);
+      break;
+    default:
+      check(false, "before GC system element");
+  }
+  state_ = system;
+}
+
+bool MXFGCSplitterImpl::startFixedPack(const KLVKey& key, std::uint64_t length) {
+  if (!startSystemElement(key, "expected fixed length pack")) return false;
+  filling_ = &fixedPack_;
+  fixedPack_.reserve(std::min(length, largestReservation));
+  return true;
+}
+
+void MXFGCSplitterImpl::requireSystem(const char* expected) const { check(state_ == system, expected); }
+
+void MXFGCSplitterImpl::startLocalItem(std::uint32_t tag, std::uint64_t length) {
+  requireSystem("expected local item");
+  localItems_.emplace_back(static_cast<std::uint16_t>(tag), ByteVector());
+  filling_ = &localItems_.back().second;
+  filling_->reserve(std::min(length, largestReservation));
+}
+
+void MXFGCSplitterImpl::startVariableItem(std::uint64_t length) {
+  requireSystem("expected variable length item");
+  variableItems_.emplace_back();
+  filling_ = &variableItems_.back();
+  filling_->reserve(std::min(length, largestReservation));
+}
+
+bool MXFGCSplitterImpl::endsSystemElement(const char* expected) const {
+  if (state_ == started || inEssence()) return false;
+  requireSystem(expected);
+  return wanted_ && systemHandler;
+}
+
+void MXFGCSplitterImpl::endLocalSet(const KLVKey& key) {
+  if (endsSystemElement("expected local set")) systemHandler->systemLocalSet(key, localItems_);
+}
+
+void MXFGCSplitterImpl::endFixedPack(const KLVKey& key) {
+  if (endsSystemElement("expected fixed length pack")) systemHandler->systemFixedPack(key, fixedPack_);
+}
+
+void MXFGCSplitterImpl::endVariablePack(const KLVKey& key) {
+  if (endsSystemElement("expected variable length pack")) systemHandler->systemVariablePack(key, variableItems_);
+}
+
+// ---------------------------------------------------------------------------
+// Values and other elements
+
+void MXFGCSplitterImpl::value(const std::uint8_t* bytes, std::streamsize size) {
+  if (inEssence()) {
+    essenceValue(bytes, size);
+    return;
+  }
+  check(state_ == system && filling_ != nullptr, "expected value");
+  filling_->insert(filling_->end(), bytes, bytes + size);
+}
+
+bool MXFGCSplitterImpl::invalidElement(const KLVKey& key) {
+  reportKey(invalidGCElementId, "invalid GC element", key);
+  return false;
+}
+
+void MXFGCSplitterImpl::report(void (ErrorHandler::*level)(const MXFUID&, const std::string&),
+                               const MXFUID& identifier, const std::string& message) {
+  if (errorHandler) (errorHandler->*level)(identifier, message);
+}
+
+void MXFGCSplitterImpl::reportKey(const MXFUID& identifier, const char* text, const KLVKey& key) {
+  std::ostringstream message;
+  message << text << " - " << key;
+  report(&ErrorHandler::error, identifier, message.str());
+}

@@ -1,0 +1,147 @@
+#include <memory>
+
+#include "metadata.h"
+#include "metadata/descriptor_support.h"
+#include "metadata/property_table.h"
+
+using zelta::insertOwned;
+using zelta::ownedAt;
+using zelta::presentValue;
+using zelta::removeOwned;
+using zelta::standardKey;
+
+Component::Component() = default;
+Component::~Component() = default;
+std::shared_ptr<Component> Component::create() { return std::make_shared<Component>(); }
+
+const std::int64_t& Component::getDuration() const { return presentValue(duration_, "Component.duration is present"); }
+
+Segment::Segment() = default;
+Segment::~Segment() = default;
+std::shared_ptr<Segment> Segment::create() { return std::make_shared<Segment>(); }
+
+Sequence::Sequence() = default;
+Sequence::~Sequence() = default;
+std::shared_ptr<Sequence> Sequence::create() { return std::make_shared<Sequence>(); }
+
+std::shared_ptr<Component> Sequence::getComponentAt(std::size_t index) { return ownedAt(components_, index); }
+
+std::shared_ptr<const Component> Sequence::getComponentAt(std::size_t index) const {
+  return ownedAt(components_, index);
+}
+
+void Sequence::addComponent(const std::shared_ptr<Component>& component) {
+  insertComponentAt(components_.size(), component);
+}
+
+void Sequence::insertComponentAt(std::size_t index, const std::shared_ptr<Component>& component) {
+  insertOwned(*this, components_, index, component);
+}
+
+void Sequence::removeComponentAt(std::size_t index) { removeOwned(*this, components_, index); }
+
+SourceReference::SourceReference() = default;
+SourceReference::~SourceReference() = default;
+std::shared_ptr<SourceReference> SourceReference::create() { return std::make_shared<SourceReference>(); }
+
+SourceClip::SourceClip() = default;
+SourceClip::~SourceClip() = default;
+std::shared_ptr<SourceClip> SourceClip::create() { return std::make_shared<SourceClip>(); }
+
+DMSourceClip::DMSourceClip() = default;
+DMSourceClip::~DMSourceClip() = default;
+std::shared_ptr<DMSourceClip> DMSourceClip::create() { return std::make_shared<DMSourceClip>(); }
+
+const std::vector<std::uint32_t>& DMSourceClip::getTargetTrackIDs() const {
+  return presentValue(targetTrackIDs_, "DMSourceClip.targetTrackIDs is present");
+}
+
+TimecodeComponent::TimecodeComponent() = default;
+TimecodeComponent::~TimecodeComponent() = default;
+std::shared_ptr<TimecodeComponent> TimecodeComponent::create() { return std::make_shared<TimecodeComponent>(); }
+
+namespace zelta {
+
+template <>
+const PropertyTable<Component>& propertyTable<Component>() {
+  typedef Component C;
+  static const PropertyTable<C> table(
+      "Component", descriptorSetKey(0x02),
+      {requiredValue("Component.dataDefinition", standardKey(0x0201), 0x0201, &C::getDataDefinition,
+                     &C::setDataDefinition),
+       optionalValue("Component.duration", standardKey(0x0202), 0x0202, &C::getDuration, &C::setDuration,
+                     &C::hasDuration)});
+  return table;
+}
+
+template <>
+const PropertyTable<Segment>& propertyTable<Segment>() {
+  static const PropertyTable<Segment> table("Segment", descriptorSetKey(0x03), {});
+  return table;
+}
+
+template <>
+const PropertyTable<Sequence>& propertyTable<Sequence>() {
+  typedef Sequence C;
+  static const PropertyTable<C> table(
+      "Sequence", descriptorSetKey(0x0F),
+      {referenceVector<C, Component>("Sequence.components", "Sequence.component", standardKey(0x1001), 0x1001,
+                                     &C::getComponentCount, &C::getComponentAt, &C::insertComponentAt)});
+  return table;
+}
+
+template <>
+const PropertyTable<SourceReference>& propertyTable<SourceReference>() {
+  typedef SourceReference C;
+  static const PropertyTable<C> table(
+      "SourceReference", descriptorSetKey(0x10),
+      {requiredValue("SourceReference.sourcePackageID", standardKey(0x1101), 0x1101, &C::getSourcePackageID,
+                     &C::setSourcePackageID),
+       requiredValue("SourceReference.sourceTrackID", standardKey(0x1102), 0x1102, &C::getSourceTrackID,
+                     &C::setSourceTrackID)});
+  return table;
+}
+
+template <>
+const PropertyTable<SourceClip>& propertyTable<SourceClip>() {
+  typedef SourceClip C;
+  static const PropertyTable<C> table(
+      "SourceClip", descriptorSetKey(0x11),
+      {requiredValue("SourceClip.startPosition", standardKey(0x1201), 0x1201, &C::getStartPosition,
+                     &C::setStartPosition)});
+  return table;
+}
+
+template <>
+const PropertyTable<DMSourceClip>& propertyTable<DMSourceClip>() {
+  typedef DMSourceClip C;
+  static const PropertyTable<C> table(
+      "DMSourceClip", descriptorSetKey(0x45),
+      {optionalValue("DMSourceClip.targetTrackIDs", standardKey(0x6103), 0x6103, &C::getTargetTrackIDs,
+                     &C::setTargetTrackIDs, &C::hasTargetTrackIDs)});
+  return table;
+}
+
+template <>
+const PropertyTable<TimecodeComponent>& propertyTable<TimecodeComponent>() {
+  typedef TimecodeComponent C;
+  static const PropertyTable<C> table(
+      "TimecodeComponent", descriptorSetKey(0x14),
+      {requiredValue("TimecodeComponent.startTimecode", standardKey(0x1501), 0x1501, &C::getStartTimecode,
+                     &C::setStartTimecode),
+       requiredValue("TimecodeComponent.roundedTimecodeBase", standardKey(0x1502), 0x1502,
+                     &C::getRoundedTimecodeBase, &C::setRoundedTimecodeBase),
+       requiredValue("TimecodeComponent.dropFrame", standardKey(0x1503), 0x1503, &C::getDropFrame,
+                     &C::setDropFrame)});
+  return table;
+}
+
+}  // namespace zelta
+
+template class MetadataClassFactory<Component, MetadataObjectFactory>;
+template class MetadataClassFactory<Segment, ComponentFactory>;
+template class MetadataClassFactory<Sequence, SegmentFactory>;
+template class MetadataClassFactory<SourceReference, SegmentFactory>;
+template class MetadataClassFactory<SourceClip, SourceReferenceFactory>;
+template class MetadataClassFactory<DMSourceClip, SourceClipFactory>;
+template class MetadataClassFactory<TimecodeComponent, SegmentFactory>;
