@@ -779,6 +779,11 @@ class MXFGCSplitterImpl;
 // handler's buffer, or else into the splitter's own; elements of 0x1000000
 // octets or more need the handler's. Every handler is optional, none is
 // owned. Defects of the stream are reported and skipped.
+//
+// The stream's own buffer decides how much of a value passes through it: a
+// std::ifstream given a small buffer (a few hundred octets, by pubsetbuf
+// before open) reads keys and lengths through it and every value in one
+// read() call straight into the handler's buffer.
 class MXFGCSplitter : public DullKLVHandler {
 public:
   MXFGCSplitter();
