@@ -693,6 +693,39 @@ private:
 // ---------------------------------------------------------------------------
 // Position filters and the fill item key check
 
+// What counting a position needs of the coding, for KLVTeller and
+// KLVMonitor: the octets of the key and length before a value, of the tag and
+// length before an item, and the length of a value that the handler declined,
+// which the position passes at the element's end.
+class KLVPrefixCount {
+public:
+  static constexpr std::streamoff keyOctets = 16;
+
+  void setLengthForm(std::uint8_t form);
+  // Items of a local set or variable length pack follow, until endItems.
+  void startItems(unsigned tagOctets, KLVLengthType lengthType);
+  void endItems() { itemLengthIsBER_ = false; }
+  // Key and BER length.
+  std::streamoff elementPrefix() const { return keyOctets + lengthOctets_; }
+  // Tag and length of an item.
+  std::streamoff itemPrefix() const { return tagOctets_ + itemLengthOctets_; }
+  // The prefix that the length last read closes.
+  std::streamoff currentPrefix() const { return itemLengthIsBER_ ? itemPrefix() : elementPrefix(); }
+  unsigned lengthOctets() const { return lengthOctets_; }
+  // Passes taken on, and keeps the length of a declined value.
+  bool noteStart(bool taken, std::uint64_t length);
+  // The declined length, once.
+  std::streamoff takeSkipped();
+  void reset();
+
+private:
+  unsigned lengthOctets_ = 0;
+  unsigned tagOctets_ = 0;
+  unsigned itemLengthOctets_ = 0;
+  bool itemLengthIsBER_ = false;
+  std::uint64_t skipped_ = 0;
+};
+
 // Takes the position from the input stream at the ends of a stream and counts
 // it from the coding at the events between; the position at a start event is
 // the first octet of the value.
@@ -729,17 +762,12 @@ public:
 private:
   void refresh();
   void advance(std::streamoff octets);
-  bool noteStart(bool taken, std::uint64_t length);
   void endElement();
   std::istream* stream_;
   InputLocator locator_;
-  // What the count needs of the coding; a position of -1 is told instead.
+  // A position of -1 is told instead.
   std::streamoff position_ = -1;
-  unsigned lengthOctets_ = 0;
-  unsigned tagOctets_ = 0;
-  unsigned itemLengthOctets_ = 0;
-  bool itemLengthIsBER_ = false;
-  std::uint64_t skipped_ = 0;
+  KLVPrefixCount count_;
 };
 
 // Computes the position from the events alone, for pipes and output chains.
@@ -787,15 +815,10 @@ public:
   void value(const std::uint8_t* data, std::streamsize size) override;
 
 private:
-  bool noteStart(bool taken, std::uint64_t length);
   void endElement();
 
   MonitoredLocator locator_;
-  unsigned lengthOctets_ = 0;
-  unsigned tagOctets_ = 0;
-  unsigned itemLengthOctets_ = 0;
-  bool itemLengthIsBER_ = false;
-  std::uint64_t skipped_ = 0;
+  KLVPrefixCount count_;
 };
 
 // Warns once per stream of a fill item key whose version octet is not the

@@ -1,20 +1,12 @@
 #include "klv.h"
 
-namespace {
-
-constexpr std::streamoff keyOctets = 16;
-
-unsigned octetsOfForm(std::uint8_t form) { return (form & 0x80) ? (form & 0x7F) + 1u : 1u; }
-
-}  // namespace
-
 KLVMonitor::KLVMonitor(KLVHandler* handler) : DullKLVFilter(handler) {}
 
 Locator* KLVMonitor::getLocator() { return &locator_; }
 
 unsigned KLVMonitor::getLengthOctets() const {
-  check(lengthOctets_ != 0, "BER length form has been reported");
-  return lengthOctets_;
+  check(count_.lengthOctets() != 0, "BER length form has been reported");
+  return count_.lengthOctets();
 }
 
 // The position is computed, never told.
@@ -23,7 +15,7 @@ void KLVMonitor::setLocator(Locator*) {}
 void KLVMonitor::startStream(bool hasAccurateLengths) {
   check(hasAccurateLengths, "accurate monitoring is possible");
   getHandler()->setLocator(&locator_);
-  skipped_ = 0;
+  count_.reset();
   DullKLVFilter::startStream(hasAccurateLengths);
 }
 
@@ -33,25 +25,16 @@ void KLVMonitor::endStream(bool aborted) {
 }
 
 void KLVMonitor::setLengthForm(std::uint8_t form) {
-  lengthOctets_ = octetsOfForm(form);
-  if (itemLengthIsBER_) itemLengthOctets_ = lengthOctets_;
+  count_.setLengthForm(form);
   DullKLVFilter::setLengthForm(form);
 }
 
 // A declined value is never seen here; its length is added at the end event.
-bool KLVMonitor::noteStart(bool taken, std::uint64_t length) {
-  skipped_ = taken ? 0 : length;
-  return taken;
-}
-
-void KLVMonitor::endElement() {
-  locator_.advance(static_cast<std::streamoff>(skipped_));
-  skipped_ = 0;
-}
+void KLVMonitor::endElement() { locator_.advance(count_.takeSkipped()); }
 
 bool KLVMonitor::startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
-  locator_.advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startIndividualItem(key, length, buffer), length);
+  locator_.advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startIndividualItem(key, length, buffer), length);
 }
 
 void KLVMonitor::endIndividualItem(const KLVKey& key) {
@@ -60,15 +43,15 @@ void KLVMonitor::endIndividualItem(const KLVKey& key) {
 }
 
 bool KLVMonitor::startLabel(const KLVKey& key) {
-  locator_.advance(keyOctets);
+  locator_.advance(KLVPrefixCount::keyOctets);
   return DullKLVFilter::startLabel(key);
 }
 
 void KLVMonitor::endLabel(const KLVKey& key) { DullKLVFilter::endLabel(key); }
 
 bool KLVMonitor::startUniversalSet(const KLVKey& key, std::uint64_t length) {
-  locator_.advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startUniversalSet(key, length), length);
+  locator_.advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startUniversalSet(key, length), length);
 }
 
 void KLVMonitor::endUniversalSet(const KLVKey& key) {
@@ -77,22 +60,20 @@ void KLVMonitor::endUniversalSet(const KLVKey& key) {
 }
 
 bool KLVMonitor::startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType, KLVLengthType lengthType) {
-  locator_.advance(keyOctets + lengthOctets_);
-  tagOctets_ = KLVTagTypeOctets(tagType);
-  itemLengthIsBER_ = lengthType == KLVLengthTypeBER;
-  itemLengthOctets_ = itemLengthIsBER_ ? lengthOctets_ : KLVFixedLengthTypeOctets(lengthType);
-  return noteStart(DullKLVFilter::startLocalSet(key, length, tagType, lengthType), length);
+  locator_.advance(count_.elementPrefix());
+  count_.startItems(KLVTagTypeOctets(tagType), lengthType);
+  return count_.noteStart(DullKLVFilter::startLocalSet(key, length, tagType, lengthType), length);
 }
 
 void KLVMonitor::endLocalSet(const KLVKey& key) {
   endElement();
-  itemLengthIsBER_ = false;
+  count_.endItems();
   DullKLVFilter::endLocalSet(key);
 }
 
 bool KLVMonitor::startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) {
-  locator_.advance(tagOctets_ + itemLengthOctets_);
-  return noteStart(DullKLVFilter::startLocalItem(tag, length, buffer), length);
+  locator_.advance(count_.itemPrefix());
+  return count_.noteStart(DullKLVFilter::startLocalItem(tag, length, buffer), length);
 }
 
 void KLVMonitor::endLocalItem(std::uint32_t tag) {
@@ -101,8 +82,8 @@ void KLVMonitor::endLocalItem(std::uint32_t tag) {
 }
 
 bool KLVMonitor::startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
-  locator_.advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startFixedLengthPack(key, length, buffer), length);
+  locator_.advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startFixedLengthPack(key, length, buffer), length);
 }
 
 void KLVMonitor::endFixedLengthPack(const KLVKey& key) {
@@ -111,21 +92,20 @@ void KLVMonitor::endFixedLengthPack(const KLVKey& key) {
 }
 
 bool KLVMonitor::startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) {
-  locator_.advance(keyOctets + lengthOctets_);
-  itemLengthIsBER_ = lengthType == KLVLengthTypeBER;
-  itemLengthOctets_ = itemLengthIsBER_ ? lengthOctets_ : KLVFixedLengthTypeOctets(lengthType);
-  return noteStart(DullKLVFilter::startVariableLengthPack(key, length, lengthType), length);
+  locator_.advance(count_.elementPrefix());
+  count_.startItems(0, lengthType);
+  return count_.noteStart(DullKLVFilter::startVariableLengthPack(key, length, lengthType), length);
 }
 
 void KLVMonitor::endVariableLengthPack(const KLVKey& key) {
   endElement();
-  itemLengthIsBER_ = false;
+  count_.endItems();
   DullKLVFilter::endVariableLengthPack(key);
 }
 
 bool KLVMonitor::startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) {
-  locator_.advance(itemLengthOctets_);
-  return noteStart(DullKLVFilter::startVariableLengthItem(length, buffer), length);
+  locator_.advance(count_.itemPrefix());
+  return count_.noteStart(DullKLVFilter::startVariableLengthItem(length, buffer), length);
 }
 
 void KLVMonitor::endVariableLengthItem() {
@@ -134,8 +114,8 @@ void KLVMonitor::endVariableLengthItem() {
 }
 
 bool KLVMonitor::startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) {
-  locator_.advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startWrapper(key, length, isWrapper, buffer), length);
+  locator_.advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startWrapper(key, length, isWrapper, buffer), length);
 }
 
 void KLVMonitor::endWrapper(const KLVKey& key) {

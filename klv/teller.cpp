@@ -1,13 +1,5 @@
 #include "klv.h"
 
-namespace {
-
-constexpr std::streamoff keyOctets = 16;
-
-unsigned octetsOfForm(std::uint8_t form) { return (form & 0x80) ? (form & 0x7F) + 1u : 1u; }
-
-}  // namespace
-
 KLVTeller::KLVTeller(std::istream& stream, KLVHandler* handler) : DullKLVFilter(handler), stream_(&stream) {}
 
 Locator* KLVTeller::getLocator() { return &locator_; }
@@ -43,15 +35,7 @@ void KLVTeller::advance(std::streamoff octets) {
 }
 
 // A declined value is never seen here; its length is added at the end event.
-bool KLVTeller::noteStart(bool taken, std::uint64_t length) {
-  skipped_ = taken ? 0 : length;
-  return taken;
-}
-
-void KLVTeller::endElement() {
-  advance(static_cast<std::streamoff>(skipped_));
-  skipped_ = 0;
-}
+void KLVTeller::endElement() { advance(count_.takeSkipped()); }
 
 void KLVTeller::setLocator(Locator* locator) {
   refresh();
@@ -60,8 +44,7 @@ void KLVTeller::setLocator(Locator* locator) {
 
 void KLVTeller::startStream(bool hasAccurateLengths) {
   refresh();
-  itemLengthIsBER_ = false;
-  skipped_ = 0;
+  count_.reset();
   getHandler()->setLocator(&locator_);
   DullKLVFilter::startStream(hasAccurateLengths);
 }
@@ -74,22 +57,20 @@ void KLVTeller::endStream(bool aborted) {
 // The reader has read the new length already: the position shown is behind
 // it, while the count waits for the start event that follows.
 void KLVTeller::setLengthForm(std::uint8_t form) {
-  lengthOctets_ = octetsOfForm(form);
-  if (itemLengthIsBER_) itemLengthOctets_ = lengthOctets_;
+  count_.setLengthForm(form);
   if (position_ < 0) {
     // A told position here lies behind the length, no base for the count.
     refresh();
     position_ = -1;
   } else {
-    const unsigned prefix = itemLengthIsBER_ ? tagOctets_ + itemLengthOctets_ : keyOctets + lengthOctets_;
-    locator_.setPosition(position_ + prefix);
+    locator_.setPosition(position_ + count_.currentPrefix());
   }
   DullKLVFilter::setLengthForm(form);
 }
 
 bool KLVTeller::startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
-  advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startIndividualItem(key, length, buffer), length);
+  advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startIndividualItem(key, length, buffer), length);
 }
 
 void KLVTeller::endIndividualItem(const KLVKey& key) {
@@ -98,7 +79,7 @@ void KLVTeller::endIndividualItem(const KLVKey& key) {
 }
 
 bool KLVTeller::startLabel(const KLVKey& key) {
-  advance(keyOctets);
+  advance(KLVPrefixCount::keyOctets);
   return DullKLVFilter::startLabel(key);
 }
 
@@ -108,8 +89,8 @@ void KLVTeller::endLabel(const KLVKey& key) {
 }
 
 bool KLVTeller::startUniversalSet(const KLVKey& key, std::uint64_t length) {
-  advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startUniversalSet(key, length), length);
+  advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startUniversalSet(key, length), length);
 }
 
 void KLVTeller::endUniversalSet(const KLVKey& key) {
@@ -118,22 +99,20 @@ void KLVTeller::endUniversalSet(const KLVKey& key) {
 }
 
 bool KLVTeller::startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType, KLVLengthType lengthType) {
-  advance(keyOctets + lengthOctets_);
-  tagOctets_ = KLVTagTypeOctets(tagType);
-  itemLengthIsBER_ = lengthType == KLVLengthTypeBER;
-  itemLengthOctets_ = itemLengthIsBER_ ? lengthOctets_ : KLVFixedLengthTypeOctets(lengthType);
-  return noteStart(DullKLVFilter::startLocalSet(key, length, tagType, lengthType), length);
+  advance(count_.elementPrefix());
+  count_.startItems(KLVTagTypeOctets(tagType), lengthType);
+  return count_.noteStart(DullKLVFilter::startLocalSet(key, length, tagType, lengthType), length);
 }
 
 void KLVTeller::endLocalSet(const KLVKey& key) {
   endElement();
-  itemLengthIsBER_ = false;
+  count_.endItems();
   DullKLVFilter::endLocalSet(key);
 }
 
 bool KLVTeller::startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) {
-  advance(tagOctets_ + itemLengthOctets_);
-  return noteStart(DullKLVFilter::startLocalItem(tag, length, buffer), length);
+  advance(count_.itemPrefix());
+  return count_.noteStart(DullKLVFilter::startLocalItem(tag, length, buffer), length);
 }
 
 void KLVTeller::endLocalItem(std::uint32_t tag) {
@@ -142,8 +121,8 @@ void KLVTeller::endLocalItem(std::uint32_t tag) {
 }
 
 bool KLVTeller::startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
-  advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startFixedLengthPack(key, length, buffer), length);
+  advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startFixedLengthPack(key, length, buffer), length);
 }
 
 void KLVTeller::endFixedLengthPack(const KLVKey& key) {
@@ -152,22 +131,20 @@ void KLVTeller::endFixedLengthPack(const KLVKey& key) {
 }
 
 bool KLVTeller::startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) {
-  advance(keyOctets + lengthOctets_);
-  tagOctets_ = 0;
-  itemLengthIsBER_ = lengthType == KLVLengthTypeBER;
-  itemLengthOctets_ = itemLengthIsBER_ ? lengthOctets_ : KLVFixedLengthTypeOctets(lengthType);
-  return noteStart(DullKLVFilter::startVariableLengthPack(key, length, lengthType), length);
+  advance(count_.elementPrefix());
+  count_.startItems(0, lengthType);
+  return count_.noteStart(DullKLVFilter::startVariableLengthPack(key, length, lengthType), length);
 }
 
 void KLVTeller::endVariableLengthPack(const KLVKey& key) {
   endElement();
-  itemLengthIsBER_ = false;
+  count_.endItems();
   DullKLVFilter::endVariableLengthPack(key);
 }
 
 bool KLVTeller::startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) {
-  advance(itemLengthOctets_);
-  return noteStart(DullKLVFilter::startVariableLengthItem(length, buffer), length);
+  advance(count_.itemPrefix());
+  return count_.noteStart(DullKLVFilter::startVariableLengthItem(length, buffer), length);
 }
 
 void KLVTeller::endVariableLengthItem() {
@@ -176,8 +153,8 @@ void KLVTeller::endVariableLengthItem() {
 }
 
 bool KLVTeller::startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) {
-  advance(keyOctets + lengthOctets_);
-  return noteStart(DullKLVFilter::startWrapper(key, length, isWrapper, buffer), length);
+  advance(count_.elementPrefix());
+  return count_.noteStart(DullKLVFilter::startWrapper(key, length, isWrapper, buffer), length);
 }
 
 void KLVTeller::endWrapper(const KLVKey& key) {

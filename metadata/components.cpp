@@ -1,7 +1,6 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
 #include "metadata/property_table.h"
 
 using zelta::insertOwned;
@@ -66,7 +65,7 @@ template <>
 const PropertyTable<Component>& propertyTable<Component>() {
   typedef Component C;
   static const PropertyTable<C> table(
-      "Component", descriptorSetKey(0x02),
+      "Component", formatSetKey(0x02),
       {requiredValue("Component.dataDefinition", standardKey(0x0201), 0x0201, &C::getDataDefinition,
                      &C::setDataDefinition),
        optionalValue("Component.duration", standardKey(0x0202), 0x0202, &C::getDuration, &C::setDuration,
@@ -76,7 +75,7 @@ const PropertyTable<Component>& propertyTable<Component>() {
 
 template <>
 const PropertyTable<Segment>& propertyTable<Segment>() {
-  static const PropertyTable<Segment> table("Segment", descriptorSetKey(0x03), {});
+  static const PropertyTable<Segment> table("Segment", formatSetKey(0x03), {});
   return table;
 }
 
@@ -84,7 +83,7 @@ template <>
 const PropertyTable<Sequence>& propertyTable<Sequence>() {
   typedef Sequence C;
   static const PropertyTable<C> table(
-      "Sequence", descriptorSetKey(0x0F),
+      "Sequence", formatSetKey(0x0F),
       {referenceVector<C, Component>("Sequence.components", "Sequence.component", standardKey(0x1001), 0x1001,
                                      &C::getComponentCount, &C::getComponentAt, &C::insertComponentAt)});
   return table;
@@ -94,7 +93,7 @@ template <>
 const PropertyTable<SourceReference>& propertyTable<SourceReference>() {
   typedef SourceReference C;
   static const PropertyTable<C> table(
-      "SourceReference", descriptorSetKey(0x10),
+      "SourceReference", formatSetKey(0x10),
       {requiredValue("SourceReference.sourcePackageID", standardKey(0x1101), 0x1101, &C::getSourcePackageID,
                      &C::setSourcePackageID),
        requiredValue("SourceReference.sourceTrackID", standardKey(0x1102), 0x1102, &C::getSourceTrackID,
@@ -106,7 +105,7 @@ template <>
 const PropertyTable<SourceClip>& propertyTable<SourceClip>() {
   typedef SourceClip C;
   static const PropertyTable<C> table(
-      "SourceClip", descriptorSetKey(0x11),
+      "SourceClip", formatSetKey(0x11),
       {requiredValue("SourceClip.startPosition", standardKey(0x1201), 0x1201, &C::getStartPosition,
                      &C::setStartPosition)});
   return table;
@@ -116,7 +115,7 @@ template <>
 const PropertyTable<DMSourceClip>& propertyTable<DMSourceClip>() {
   typedef DMSourceClip C;
   static const PropertyTable<C> table(
-      "DMSourceClip", descriptorSetKey(0x45),
+      "DMSourceClip", formatSetKey(0x45),
       {optionalValue("DMSourceClip.targetTrackIDs", standardKey(0x6103), 0x6103, &C::getTargetTrackIDs,
                      &C::setTargetTrackIDs, &C::hasTargetTrackIDs)});
   return table;
@@ -126,7 +125,7 @@ template <>
 const PropertyTable<TimecodeComponent>& propertyTable<TimecodeComponent>() {
   typedef TimecodeComponent C;
   static const PropertyTable<C> table(
-      "TimecodeComponent", descriptorSetKey(0x14),
+      "TimecodeComponent", formatSetKey(0x14),
       {requiredValue("TimecodeComponent.startTimecode", standardKey(0x1501), 0x1501, &C::getStartTimecode,
                      &C::setStartTimecode),
        requiredValue("TimecodeComponent.roundedTimecodeBase", standardKey(0x1502), 0x1502,

@@ -1,7 +1,6 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
 #include "metadata/property_table.h"
 
 using zelta::insertOwned;
@@ -73,7 +72,7 @@ template <>
 const PropertyTable<ContentStorage>& propertyTable<ContentStorage>() {
   typedef ContentStorage C;
   static const PropertyTable<C> table(
-      "ContentStorage", descriptorSetKey(0x18),
+      "ContentStorage", formatSetKey(0x18),
       {referenceVector<C, GenericPackage>("ContentStorage.packages", "ContentStorage.package", standardKey(0x1901),
                                           0x1901, &C::getPackageCount, &C::getPackageAt, &C::insertPackageAt),
        referenceVector<C, EssenceContainerData>(
@@ -87,7 +86,7 @@ template <>
 const PropertyTable<EssenceContainerData>& propertyTable<EssenceContainerData>() {
   typedef EssenceContainerData C;
   static const PropertyTable<C> table(
-      "EssenceContainerData", descriptorSetKey(0x23),
+      "EssenceContainerData", formatSetKey(0x23),
       {requiredValue("EssenceContainerData.linkedPackageUID", standardKey(0x2701), 0x2701, &C::getLinkedPackageUID,
                      &C::setLinkedPackageUID),
        optionalValue("EssenceContainerData.indexSID", standardKey(0x3F06), 0x3F06, &C::getIndexSID, &C::setIndexSID,

@@ -1,7 +1,6 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
 #include "metadata/property_table.h"
 
 using zelta::presentValue;
@@ -63,7 +62,7 @@ template <>
 const PropertyTable<Event>& propertyTable<Event>() {
   typedef Event C;
   static const PropertyTable<C> table(
-      "Event", descriptorSetKey(0x06),
+      "Event", formatSetKey(0x06),
       {optionalValue("Event.position", standardKey(0x0601), 0x0601, &C::getPosition, &C::setPosition,
                      &C::hasPosition),
        optionalValue("Event.comment", standardKey(0x0602), 0x0602, &C::getComment, &C::setComment,
@@ -78,7 +77,7 @@ const PropertyTable<CommentMarker>& propertyTable<CommentMarker>() {
   static const KLVKey annotationKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, 0x02, 0x06,
                                                                  0x01, 0x01, 0x04, 0x02, 0x0A, 0x00, 0x00});
   static const PropertyTable<C> table(
-      "CommentMarker", descriptorSetKey(0x08),
+      "CommentMarker", formatSetKey(0x08),
       {strongReference<C, SourceReference>("CommentMarker.annotation", annotationKey, 0x0901,
                                            &C::getAnnotation, &C::setAnnotation, &C::hasAnnotation)});
   return table;
@@ -88,7 +87,7 @@ template <>
 const PropertyTable<DMSegment>& propertyTable<DMSegment>() {
   typedef DMSegment C;
   static const PropertyTable<C> table(
-      "DMSegment", descriptorSetKey(0x41),
+      "DMSegment", formatSetKey(0x41),
       {optionalValue("DMSegment.targetTrackIDs", standardKey(0x6102), 0x6102, &C::getTargetTrackIDs,
                      &C::setTargetTrackIDs, &C::hasTargetTrackIDs),
        strongReference<C, DescriptiveMetadataFramework>("DMSegment.dmFramework", standardKey(0x6101), 0x6101,

@@ -1,7 +1,7 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
+#include "metadata/descriptor_tables.h"
 
 using zelta::insertOwned;
 using zelta::ownedAt;
@@ -120,14 +120,14 @@ const KLVKey genericSubDescriptorsKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0
 
 template <>
 const PropertyTable<SubDescriptor>& propertyTable<SubDescriptor>() {
-  static const PropertyTable<SubDescriptor> table("SubDescriptor", descriptorSetKey(0x59), {});
+  static const PropertyTable<SubDescriptor> table("SubDescriptor", formatSetKey(0x59), {});
   return table;
 }
 
 template <>
 const PropertyTable<ContainerConstraintsSubDescriptor>& propertyTable<ContainerConstraintsSubDescriptor>() {
   static const PropertyTable<ContainerConstraintsSubDescriptor> table("ContainerConstraintsSubDescriptor",
-                                                                      descriptorSetKey(0x67), {});
+                                                                      formatSetKey(0x67), {});
   return table;
 }
 
@@ -135,7 +135,7 @@ template <>
 const PropertyTable<GenericDescriptor>& propertyTable<GenericDescriptor>() {
   typedef GenericDescriptor C;
   static const PropertyTable<C> table(
-      "GenericDescriptor", descriptorSetKey(0x24),
+      "GenericDescriptor", formatSetKey(0x24),
       {referenceVector<C, GenericLocator>("GenericDescriptor.locators", "GenericDescriptor.locator",
                                           standardKey(0x2F01), 0x2F01, &C::getLocatorCount, &C::getLocatorAt,
                                           &C::insertLocatorAt, &C::hasLocators),
@@ -150,7 +150,7 @@ template <>
 const PropertyTable<FileDescriptor>& propertyTable<FileDescriptor>() {
   typedef FileDescriptor C;
   static const PropertyTable<C> table(
-      "FileDescriptor", descriptorSetKey(0x25),
+      "FileDescriptor", formatSetKey(0x25),
       {optionalStandard("FileDescriptor.linkedTrackID", 0x3006, &C::getLinkedTrackID, &C::setLinkedTrackID,
                         &C::hasLinkedTrackID),
        requiredStandard("FileDescriptor.sampleRate", 0x3001, &C::getSampleRate, &C::setSampleRate),
@@ -165,7 +165,7 @@ template <>
 const PropertyTable<MultipleDescriptor>& propertyTable<MultipleDescriptor>() {
   typedef MultipleDescriptor C;
   static const PropertyTable<C> table(
-      "MultipleDescriptor", descriptorSetKey(0x44),
+      "MultipleDescriptor", formatSetKey(0x44),
       {referenceVector<C, FileDescriptor>("MultipleDescriptor.subDescriptors", "MultipleDescriptor.subDescriptor",
                                           standardKey(0x3F01), 0x3F01, &C::getSubDescriptorCount,
                                           &C::getSubDescriptorAt, &C::insertSubDescriptorAt)});

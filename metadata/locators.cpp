@@ -1,7 +1,7 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
+#include "metadata/descriptor_tables.h"
 
 GenericLocator::GenericLocator() = default;
 GenericLocator::~GenericLocator() = default;
@@ -19,14 +19,14 @@ namespace zelta {
 
 template <>
 const PropertyTable<GenericLocator>& propertyTable<GenericLocator>() {
-  static const PropertyTable<GenericLocator> table("GenericLocator", descriptorSetKey(0x31), {});
+  static const PropertyTable<GenericLocator> table("GenericLocator", formatSetKey(0x31), {});
   return table;
 }
 
 template <>
 const PropertyTable<NetworkLocator>& propertyTable<NetworkLocator>() {
   static const PropertyTable<NetworkLocator> table(
-      "NetworkLocator", descriptorSetKey(0x32),
+      "NetworkLocator", formatSetKey(0x32),
       {requiredValue("NetworkLocator.urlString", standardKey(0x4001), 0x4001, &NetworkLocator::getURLString,
                      &NetworkLocator::setURLString)});
   return table;
@@ -35,7 +35,7 @@ const PropertyTable<NetworkLocator>& propertyTable<NetworkLocator>() {
 template <>
 const PropertyTable<TextLocator>& propertyTable<TextLocator>() {
   static const PropertyTable<TextLocator> table(
-      "TextLocator", descriptorSetKey(0x33),
+      "TextLocator", formatSetKey(0x33),
       {requiredValue("TextLocator.locatorName", standardKey(0x4101), 0x4101, &TextLocator::getLocatorName,
                      &TextLocator::setLocatorName)});
   return table;

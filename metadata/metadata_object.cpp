@@ -20,8 +20,7 @@ template <>
 const PropertyTable<MetadataObject>& propertyTable<MetadataObject>() {
   static const PropertyTable<MetadataObject> table(
       "MetadataObject",
-      KLVKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x02, 0x53, 0x01, 0x01, 0x0D, 0x01, 0x01, 0x01, 0x01,
-                                          0x01, 0x01, 0x00}),
+      formatSetKey(0x01),
       {optionalValue("MetadataObject.generationUID", standardKey(0x0102), 0x0102, &MetadataObject::getGenerationUID,
                      &MetadataObject::setGenerationUID, &MetadataObject::hasGenerationUID)});
   return table;

@@ -1,9 +1,8 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
-#include "metadata/present_time.h"
 #include "metadata/property_table.h"
+#include "metadata/present_time.h"
 
 using zelta::insertOwned;
 using zelta::ownedAt;
@@ -63,7 +62,7 @@ template <>
 const PropertyTable<GenericPackage>& propertyTable<GenericPackage>() {
   typedef GenericPackage C;
   static const PropertyTable<C> table(
-      "GenericPackage", descriptorSetKey(0x34),
+      "GenericPackage", formatSetKey(0x34),
       {requiredValue("GenericPackage.packageUID", standardKey(0x4401), 0x4401, &C::getPackageUID,
                      &C::setPackageUID),
        optionalValue("GenericPackage.name", standardKey(0x4402), 0x4402, &C::getName, &C::setName, &C::hasName),
@@ -78,7 +77,7 @@ const PropertyTable<GenericPackage>& propertyTable<GenericPackage>() {
 
 template <>
 const PropertyTable<MaterialPackage>& propertyTable<MaterialPackage>() {
-  static const PropertyTable<MaterialPackage> table("MaterialPackage", descriptorSetKey(0x36), {});
+  static const PropertyTable<MaterialPackage> table("MaterialPackage", formatSetKey(0x36), {});
   return table;
 }
 
@@ -86,7 +85,7 @@ template <>
 const PropertyTable<SourcePackage>& propertyTable<SourcePackage>() {
   typedef SourcePackage C;
   static const PropertyTable<C> table(
-      "SourcePackage", descriptorSetKey(0x37),
+      "SourcePackage", formatSetKey(0x37),
       {strongReference<C, GenericDescriptor>("SourcePackage.descriptor", standardKey(0x4701), 0x4701,
                                              &C::getDescriptor, &C::setDescriptor)});
   return table;

@@ -1,7 +1,7 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
+#include "metadata/descriptor_tables.h"
 #include "metadata/rgba_layout.h"
 
 using zelta::presentValue;
@@ -172,7 +172,7 @@ template <>
 const PropertyTable<PictureDescriptor>& propertyTable<PictureDescriptor>() {
   typedef PictureDescriptor C;
   static const PropertyTable<C> table(
-      "PictureDescriptor", descriptorSetKey(0x27),
+      "PictureDescriptor", formatSetKey(0x27),
       {optionalStandard("PictureDescriptor.signalStandard", 0x3215, &C::getSignalStandard, &C::setSignalStandard,
                         &C::hasSignalStandard),
        requiredStandard("PictureDescriptor.frameLayout", 0x320C, &C::getFrameLayout, &C::setFrameLayout),
@@ -227,7 +227,7 @@ template <>
 const PropertyTable<CDCIPictureDescriptor>& propertyTable<CDCIPictureDescriptor>() {
   typedef CDCIPictureDescriptor C;
   static const PropertyTable<C> table(
-      "CDCIPictureDescriptor", descriptorSetKey(0x28),
+      "CDCIPictureDescriptor", formatSetKey(0x28),
       {requiredStandard("CDCIPictureDescriptor.componentDepth", 0x3301, &C::getComponentDepth, &C::setComponentDepth),
        requiredStandard("CDCIPictureDescriptor.horizontalSubsampling", 0x3302, &C::getHorizontalSubsampling,
                         &C::setHorizontalSubsampling),
@@ -254,7 +254,7 @@ template <>
 const PropertyTable<RGBAPictureDescriptor>& propertyTable<RGBAPictureDescriptor>() {
   typedef RGBAPictureDescriptor C;
   static const PropertyTable<C> table(
-      "RGBAPictureDescriptor", descriptorSetKey(0x29),
+      "RGBAPictureDescriptor", formatSetKey(0x29),
       {optionalStandard("RGBAPictureDescriptor.componentMaxReferenceLevel", 0x3406, &C::getComponentMaxReferenceLevel,
                         &C::setComponentMaxReferenceLevel, &C::hasComponentMaxReferenceLevel),
        optionalStandard("RGBAPictureDescriptor.componentMinReferenceLevel", 0x3407, &C::getComponentMinReferenceLevel,

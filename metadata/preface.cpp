@@ -1,9 +1,8 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
-#include "metadata/present_time.h"
 #include "metadata/property_table.h"
+#include "metadata/present_time.h"
 
 using zelta::insertOwned;
 using zelta::ownedAt;
@@ -90,7 +89,7 @@ template <>
 const PropertyTable<Preface>& propertyTable<Preface>() {
   typedef Preface C;
   static const PropertyTable<C> table(
-      "Preface", descriptorSetKey(0x2F),
+      "Preface", formatSetKey(0x2F),
       {requiredValue("Preface.lastModifiedDate", standardKey(0x3B02), 0x3B02, &C::getLastModifiedDate,
                      &C::setLastModifiedDate),
        requiredValue("Preface.version", standardKey(0x3B05), 0x3B05, &C::getVersion, &C::setVersion),
@@ -115,7 +114,7 @@ template <>
 const PropertyTable<Identification>& propertyTable<Identification>() {
   typedef Identification C;
   static const PropertyTable<C> table(
-      "Identification", descriptorSetKey(0x30),
+      "Identification", formatSetKey(0x30),
       {requiredValue("Identification.thisGenerationUID", standardKey(0x3C09), 0x3C09, &C::getThisGenerationUID,
                      &C::setThisGenerationUID),
        requiredValue("Identification.companyName", standardKey(0x3C01), 0x3C01, &C::getCompanyName,

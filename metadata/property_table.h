@@ -6,9 +6,12 @@
 #ifndef ZELTA_METADATA_PROPERTY_TABLE_H
 #define ZELTA_METADATA_PROPERTY_TABLE_H
 
+#include <array>
+#include <cstddef>
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <type_traits>
 #include <vector>
@@ -133,6 +136,42 @@ const PropertyTable<C>& propertyTable();
 // class tables do not spell the keys a second time.
 inline const KLVKey& standardKey(std::uint16_t tag) { return getMXFStandardPrimerKeys().at(tag); }
 
+// The set key of a class of the format: 06 0E 2B 34 02 53 01 01 0D 01 01 01 01 01,
+// the class octet, 00.
+inline KLVKey formatSetKey(std::uint8_t classOctet) {
+  return KLVKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x02, 0x53, 0x01, 0x01, 0x0D, 0x01, 0x01, 0x01,
+                                             0x01, 0x01, classOctet, 0x00});
+}
+
+template <typename T>
+const T& presentValue(const std::optional<T>& value, const char* isPresent) {
+  check(value.has_value(), isPresent);
+  return *value;
+}
+
+template <typename T>
+const std::shared_ptr<T>& ownedAt(const std::vector<std::shared_ptr<T>>& elements, std::size_t index) {
+  check(index < elements.size(), "valid index");
+  return elements[index];
+}
+
+// The owner takes the element before it goes in, so that a failed check
+// leaves the vector as it was.
+template <typename T>
+void insertOwned(MetadataRoot& owner, std::vector<std::shared_ptr<T>>& elements, std::size_t index,
+                 const std::shared_ptr<T>& element) {
+  check(index <= elements.size(), "valid index");
+  owner.takeOwnership(element);
+  elements.insert(elements.begin() + static_cast<std::ptrdiff_t>(index), element);
+}
+
+template <typename T>
+void removeOwned(MetadataRoot& owner, std::vector<std::shared_ptr<T>>& elements, std::size_t index) {
+  check(index < elements.size(), "valid index");
+  owner.releaseOwnership(elements[index]);
+  elements.erase(elements.begin() + static_cast<std::ptrdiff_t>(index));
+}
+
 // Descriptors by kind of property, over the accessors of the class.
 
 template <typename C, typename T>
@@ -238,6 +277,19 @@ PropertyDescriptor<C> referenceVector(const std::string& name, const std::string
             return true;
           },
           MXFPropertyKind::strongReferenceVector};
+}
+
+// A value of class C whose key is in the standard primer, by its tag.
+template <typename C, typename T>
+PropertyDescriptor<C> optionalStandard(const std::string& name, std::uint16_t tag, const T& (C::*getter)() const,
+                                       void (C::*setter)(const T&), bool (C::*has)() const) {
+  return optionalValue(name, standardKey(tag), tag, getter, setter, has);
+}
+
+template <typename C, typename T>
+PropertyDescriptor<C> requiredStandard(const std::string& name, std::uint16_t tag, const T& (C::*getter)() const,
+                                       void (C::*setter)(const T&)) {
+  return requiredValue(name, standardKey(tag), tag, getter, setter);
 }
 
 }  // namespace zelta

@@ -1,7 +1,7 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
+#include "metadata/descriptor_tables.h"
 
 using zelta::presentValue;
 
@@ -39,7 +39,7 @@ template <>
 const PropertyTable<SoundDescriptor>& propertyTable<SoundDescriptor>() {
   typedef SoundDescriptor C;
   static const PropertyTable<C> table(
-      "SoundDescriptor", descriptorSetKey(0x42),
+      "SoundDescriptor", formatSetKey(0x42),
       {requiredStandard("SoundDescriptor.audioSamplingRate", 0x3D03, &C::getAudioSamplingRate,
                         &C::setAudioSamplingRate),
        requiredStandard("SoundDescriptor.locked", 0x3D02, &C::getLocked, &C::setLocked),
@@ -59,7 +59,7 @@ template <>
 const PropertyTable<DataDescriptor>& propertyTable<DataDescriptor>() {
   typedef DataDescriptor C;
   static const PropertyTable<C> table(
-      "DataDescriptor", descriptorSetKey(0x43),
+      "DataDescriptor", formatSetKey(0x43),
       {optionalStandard("DataDescriptor.dataEssenceCoding", 0x3E01, &C::getDataEssenceCoding, &C::setDataEssenceCoding,
                         &C::hasDataEssenceCoding)});
   return table;

@@ -1,7 +1,6 @@
 #include <memory>
 
 #include "metadata.h"
-#include "metadata/descriptor_support.h"
 #include "metadata/property_table.h"
 
 using zelta::presentValue;
@@ -46,7 +45,7 @@ template <>
 const PropertyTable<Track>& propertyTable<Track>() {
   typedef Track C;
   static const PropertyTable<C> table(
-      "Track", descriptorSetKey(0x38),
+      "Track", formatSetKey(0x38),
       {requiredValue("Track.trackID", standardKey(0x4801), 0x4801, &C::getTrackID, &C::setTrackID),
        optionalValue("Track.trackNumber", standardKey(0x4804), 0x4804, &C::getTrackNumber, &C::setTrackNumber,
                      &C::hasTrackNumber),
@@ -60,7 +59,7 @@ template <>
 const PropertyTable<TimelineTrack>& propertyTable<TimelineTrack>() {
   typedef TimelineTrack C;
   static const PropertyTable<C> table(
-      "TimelineTrack", descriptorSetKey(0x3B),
+      "TimelineTrack", formatSetKey(0x3B),
       {requiredValue("TimelineTrack.editRate", standardKey(0x4B01), 0x4B01, &C::getEditRate, &C::setEditRate),
        requiredValue("TimelineTrack.origin", standardKey(0x4B02), 0x4B02, &C::getOrigin, &C::setOrigin)});
   return table;
@@ -70,7 +69,7 @@ template <>
 const PropertyTable<EventTrack>& propertyTable<EventTrack>() {
   typedef EventTrack C;
   static const PropertyTable<C> table(
-      "EventTrack", descriptorSetKey(0x39),
+      "EventTrack", formatSetKey(0x39),
       {requiredValue("EventTrack.editRate", standardKey(0x4901), 0x4901, &C::getEditRate, &C::setEditRate),
        optionalValue("EventTrack.origin", standardKey(0x4902), 0x4902, &C::getOrigin, &C::setOrigin,
                      &C::hasOrigin)});
@@ -79,7 +78,7 @@ const PropertyTable<EventTrack>& propertyTable<EventTrack>() {
 
 template <>
 const PropertyTable<StaticTrack>& propertyTable<StaticTrack>() {
-  static const PropertyTable<StaticTrack> table("StaticTrack", descriptorSetKey(0x3A), {});
+  static const PropertyTable<StaticTrack> table("StaticTrack", formatSetKey(0x3A), {});
   return table;
 }
 
