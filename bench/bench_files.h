@@ -53,6 +53,34 @@ inline std::string writeBenchFile(const std::string& name, const std::function<v
   return path;
 }
 
+// Buffers that a handler hands out in turn, as a decoder keeps a few frames
+// in flight; each grows to the largest length asked of it.
+class BufferPool {
+public:
+  explicit BufferPool(std::size_t count) : buffers_(count) {}
+  bool empty() const { return buffers_.empty(); }
+  std::uint8_t* next(std::uint64_t length) {
+    std::vector<std::uint8_t>& buffer = buffers_[next_++ % buffers_.size()];
+    if (buffer.size() < length) buffer.resize(length);
+    return buffer.data();
+  }
+
+private:
+  std::vector<std::vector<std::uint8_t>> buffers_;
+  std::size_t next_ = 0;
+};
+
+// Opens the file with a stream buffer of the client's, or of the file
+// stream's own when the buffer is empty. A small one leaves the stream only
+// keys and lengths to read ahead, so that every value goes from the kernel
+// straight into the handler's buffer in one read() call.
+inline void openWithStreamBuffer(std::ifstream& in, const std::string& path, std::vector<char>& streamBuffer) {
+  if (!streamBuffer.empty())
+    in.rdbuf()->pubsetbuf(streamBuffer.data(), static_cast<std::streamsize>(streamBuffer.size()));
+  in.open(path, std::ios::binary);
+  check(in.is_open(), "bench file opened");
+}
+
 inline void reportThroughput(benchmark::State& state, std::uint64_t octets, std::uint64_t elements) {
   state.SetBytesProcessed(static_cast<std::int64_t>(octets));
   state.counters["elements"] = benchmark::Counter(static_cast<double>(elements), benchmark::Counter::kIsRate);

@@ -80,18 +80,14 @@ const BenchFile& benchFile() {
   return file;
 }
 
-// Wants every picture: into the next buffer of a pool of its own, as a
-// decoder keeps a few frames in flight, or else into the splitter's buffer.
-// Four buffers of a picture each come to the plain loop's 1 MiB.
+// Wants every picture: into the next buffer of a pool of its own, or else,
+// with no pool, into the splitter's buffer. Four buffers of a picture each
+// come to the plain loop's 1 MiB.
 class PictureHandler : public DullMXFGCEssenceHandler {
 public:
   explicit PictureHandler(std::size_t ownBuffers) : own_(ownBuffers) {}
   bool startEssenceElement(const KLVKey&, std::uint64_t length, std::uint8_t*& buffer) override {
-    if (!own_.empty()) {
-      std::vector<std::uint8_t>& own = own_[next_++ % own_.size()];
-      if (own.size() < length) own.resize(length);
-      buffer = own.data();
-    }
+    if (!own_.empty()) buffer = own_.next(length);
     return true;
   }
   void pictureElement(const KLVKey&, const std::uint8_t* data, std::uint64_t length) override {
@@ -103,17 +99,16 @@ public:
   std::uint64_t pictures = 0;
 
 private:
-  std::vector<std::vector<std::uint8_t>> own_;
-  std::size_t next_ = 0;
+  zelta_bench::BufferPool own_;
 };
 
-// The essence stream as KLV, without the splitter: values into a buffer of
-// the handler's own.
+// The essence stream as KLV, without the splitter: values into the buffers
+// of the handler's own.
 class KLVPictureHandler : public DullKLVHandler {
 public:
+  explicit KLVPictureHandler(std::size_t ownBuffers) : own_(ownBuffers) {}
   bool startIndividualItem(const KLVKey&, std::uint64_t length, std::uint8_t*& buffer) override {
-    if (own_.size() < length) own_.resize(length);
-    buffer = own_.data();
+    buffer = own_.next(length);
     return true;
   }
   void endIndividualItem(const KLVKey&) override { ++pictures; }
@@ -122,13 +117,11 @@ public:
   std::uint64_t pictures = 0;
 
 private:
-  std::vector<std::uint8_t> own_;
+  zelta_bench::BufferPool own_;
 };
 
-// A stream buffer of the client's: 0 keeps the file stream's own. A small
-// one leaves the stream only the key and length of each element to read
-// ahead, so that every value goes from the kernel straight into the
-// handler's buffer in one read() call.
+// A stream buffer of the client's of the size given, or the file stream's
+// own for 0.
 template <typename Handler>
 void readEssence(benchmark::State& state, Handler& pictures, KLVHandler& essence, std::size_t streamBufferOctets) {
   const BenchFile& file = benchFile();
@@ -137,9 +130,7 @@ void readEssence(benchmark::State& state, Handler& pictures, KLVHandler& essence
   std::vector<char> streamBuffer(streamBufferOctets);
   for (auto _ : state) {
     std::ifstream in;
-    if (streamBufferOctets != 0)
-      in.rdbuf()->pubsetbuf(streamBuffer.data(), static_cast<std::streamsize>(streamBuffer.size()));
-    in.open(file.path, std::ios::binary);
+    zelta_bench::openWithStreamBuffer(in, file.path, streamBuffer);
     pictures.pictures = 0;
     MXFReader reader;
     reader.setEssenceHandler(&essence);
@@ -159,8 +150,9 @@ void BM_Splitter(benchmark::State& state) {
   readEssence(state, pictures, splitter, static_cast<std::size_t>(state.range(0)));
 }
 
-void BM_ReaderIntoKLVHandlerBuffer(benchmark::State& state) {
-  KLVPictureHandler pictures;
+// Arguments as for the splitter; the handler has at least one buffer.
+void BM_ReaderIntoKLVHandlerBuffers(benchmark::State& state) {
+  KLVPictureHandler pictures(static_cast<std::size_t>(state.range(1)));
   readEssence(state, pictures, pictures, static_cast<std::size_t>(state.range(0)));
 }
 
@@ -183,6 +175,11 @@ BENCHMARK(BM_Splitter)
     ->Unit(benchmark::kMillisecond)
     ->UseRealTime();
 BENCHMARK(BM_PlainReadLoop)->Unit(benchmark::kMillisecond)->UseRealTime();
-BENCHMARK(BM_ReaderIntoKLVHandlerBuffer)->Arg(256)->Arg(0)->Unit(benchmark::kMillisecond)->UseRealTime();
+BENCHMARK(BM_ReaderIntoKLVHandlerBuffers)
+    ->ArgNames({"streamBuffer", "handlerBuffers"})
+    ->Args({256, 4})
+    ->Args({0, 1})
+    ->Unit(benchmark::kMillisecond)
+    ->UseRealTime();
 
 BENCHMARK_MAIN();

@@ -35,14 +35,14 @@ const std::string& benchFile() {
   return path;
 }
 
-// Takes every value into a buffer of its own, or skips them all.
+// Takes every value into the buffers of its own in turn, or with none skips
+// them all.
 class CountingHandler : public DullKLVHandler {
 public:
-  explicit CountingHandler(bool take) : take_(take) {}
+  explicit CountingHandler(std::size_t ownBuffers) : own_(ownBuffers) {}
   bool startIndividualItem(const KLVKey&, std::uint64_t length, std::uint8_t*& buffer) override {
-    if (!take_) return false;
-    if (own_.size() < length) own_.resize(length);
-    buffer = own_.data();
+    if (own_.empty()) return false;
+    buffer = own_.next(length);
     return true;
   }
   void endIndividualItem(const KLVKey&) override { ++elements; }
@@ -51,17 +51,20 @@ public:
   std::uint64_t elements = 0;
 
 private:
-  bool take_;
-  std::vector<std::uint8_t> own_;
+  zelta_bench::BufferPool own_;
 };
 
-void readWithHandler(benchmark::State& state, bool take) {
+// Arguments: the client's stream buffer size (0: the file stream's own) and
+// the handler's buffers (0: every value skipped).
+void BM_Reader(benchmark::State& state) {
   const std::string& path = benchFile();
   std::uint64_t elements = 0;
   std::uint64_t octets = 0;
+  std::vector<char> streamBuffer(static_cast<std::size_t>(state.range(0)));
   for (auto _ : state) {
-    std::ifstream in(path, std::ios::binary);
-    CountingHandler handler(take);
+    std::ifstream in;
+    zelta_bench::openWithStreamBuffer(in, path, streamBuffer);
+    CountingHandler handler(static_cast<std::size_t>(state.range(1)));
     GenericKLVReader reader;
     reader.setHandler(&handler);
     reader.read(in);
@@ -72,18 +75,21 @@ void readWithHandler(benchmark::State& state, bool take) {
   zelta_bench::reportThroughput(state, octets, elements);
 }
 
-void BM_ReaderTakingValues(benchmark::State& state) { readWithHandler(state, true); }
-
-void BM_ReaderSkippingValues(benchmark::State& state) { readWithHandler(state, false); }
-
 void BM_PlainReadLoop(benchmark::State& state) {
   zelta_bench::plainReadLoop(state, benchFile(), fileOctets, elementOctets);
 }
 
 }  // namespace
 
-BENCHMARK(BM_ReaderTakingValues)->Unit(benchmark::kMillisecond)->UseRealTime();
-BENCHMARK(BM_ReaderSkippingValues)->Unit(benchmark::kMillisecond)->UseRealTime();
+BENCHMARK(BM_PlainReadLoop)->Unit(benchmark::kMillisecond)->UseRealTime();
+BENCHMARK(BM_Reader)
+    ->ArgNames({"streamBuffer", "handlerBuffers"})
+    ->Args({256, 4})
+    ->Args({0, 4})
+    ->Args({0, 1})
+    ->Args({0, 0})
+    ->Unit(benchmark::kMillisecond)
+    ->UseRealTime();
 BENCHMARK(BM_PlainReadLoop)->Unit(benchmark::kMillisecond)->UseRealTime();
 
 BENCHMARK_MAIN();
