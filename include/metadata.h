@@ -446,6 +446,14 @@ private:
 // optional one checks that it is present. Reference vectors own their
 // elements; the count of an unset optional vector is 0.
 
+namespace zelta {
+// The property table of a class, within the library.
+template <typename C>
+class PropertyTable;
+template <typename C>
+const PropertyTable<C>& propertyTable();
+}  // namespace zelta
+
 class Identification;
 class ContentStorage;
 class EssenceContainerData;
@@ -1069,6 +1077,12 @@ public:
   void removeGenericSubDescriptors();
 
 private:
+  // An empty batch read from a file is present all the same, so that writing
+  // the object again keeps it; only the class's table marks it.
+  friend const zelta::PropertyTable<GenericDescriptor>& zelta::propertyTable<GenericDescriptor>();
+  void markLocatorsPresent() { hasLocators_ = true; }
+  void markGenericSubDescriptorsPresent() { hasGenericSubDescriptors_ = true; }
+
   std::vector<std::shared_ptr<GenericLocator>> locators_;
   bool hasLocators_ = false;
   std::vector<std::shared_ptr<SubDescriptor>> genericSubDescriptors_;

@@ -138,11 +138,12 @@ const PropertyTable<GenericDescriptor>& propertyTable<GenericDescriptor>() {
       "GenericDescriptor", formatSetKey(0x24),
       {referenceVector<C, GenericLocator>("GenericDescriptor.locators", "GenericDescriptor.locator",
                                           standardKey(0x2F01), 0x2F01, &C::getLocatorCount, &C::getLocatorAt,
-                                          &C::insertLocatorAt, &C::hasLocators),
+                                          &C::insertLocatorAt, &C::hasLocators, &C::markLocatorsPresent),
        referenceVector<C, SubDescriptor>("GenericDescriptor.genericSubDescriptors",
                                          "GenericDescriptor.genericSubDescriptor", genericSubDescriptorsKey, 0,
                                          &C::getGenericSubDescriptorCount, &C::getGenericSubDescriptorAt,
-                                         &C::insertGenericSubDescriptorAt, &C::hasGenericSubDescriptors)});
+                                         &C::insertGenericSubDescriptorAt, &C::hasGenericSubDescriptors,
+                                         &C::markGenericSubDescriptorsPresent)});
   return table;
 }
 

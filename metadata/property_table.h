@@ -245,19 +245,22 @@ PropertyDescriptor<C> weakReference(const std::string& name, const KLVKey& key, 
 
 // A vector of strong references, written as a batch of identifiers; the
 // element's name ("Sequence.component") goes into the check of a null
-// element. A null has means required.
+// element. A null has means required; an optional vector is marked present
+// as soon as it is read, so that an empty batch stays present.
 template <typename C, typename V>
 PropertyDescriptor<C> referenceVector(const std::string& name, const std::string& elementName, const KLVKey& key,
                                       std::uint16_t tag, std::size_t (C::*count)() const,
                                       std::shared_ptr<const V> (C::*at)(std::size_t) const,
                                       void (C::*inserter)(std::size_t, const std::shared_ptr<V>&),
-                                      bool (C::*has)() const = nullptr) {
+                                      bool (C::*has)() const = nullptr, void (C::*markPresent)() = nullptr) {
   typedef dangling_vector_ref_t<C, V> Element;
   const std::string isPresent = elementName + " is present";
   return {name, key, tag, has ? Presence::optional : Presence::required,
-          [inserter](const std::shared_ptr<C>& object, const ByteVector& bytes, MXFPendingReferences& pending) {
+          [inserter, markPresent](const std::shared_ptr<C>& object, const ByteVector& bytes,
+                                  MXFPendingReferences& pending) {
             std::vector<MXFUID> targets;
             internalize(bytes, targets);
+            if (markPresent != nullptr) ((*object).*markPresent)();
             std::shared_ptr<Element> previous;
             for (const MXFUID& target : targets) {
               previous = std::make_shared<Element>(object, inserter, previous, true);

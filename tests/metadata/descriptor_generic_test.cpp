@@ -7,6 +7,7 @@
 #include "core/failure.h"
 #include "metadata.h"
 #include "support/metadata_descriptor_sets.h"
+#include "support/metadata_structural.h"
 #include "support/recording.h"
 
 using namespace zelta_test;
@@ -162,6 +163,42 @@ TEST(GenericDescriptor, UnsetOptionalVectorsCountZero) {
   EXPECT_EQ("assertion failure: valid index", failureOf([&] { d->getLocatorAt(0); }));
   EXPECT_EQ("assertion failure: valid index", failureOf([&] { d->insertLocatorAt(1, NetworkLocator::create()); }));
   EXPECT_FALSE(d->hasLocators());
+}
+
+TEST(GenericDescriptorFactory, EmptyBatchesOfOptionalVectorsStayPresentAndAreWrittenAgain) {
+  const std::shared_ptr<RecordingErrorHandler> errors = std::make_shared<RecordingErrorHandler>();
+  GenericDescriptorFactory factory;
+  const MXFParsedObject parsed = parseWith(factory,
+                                           {{MXFInstanceUIDKey, uid(0x11)},
+                                            {locatorsKey, bytesOf("00000000 00000010")},
+                                            {genericSubDescriptorsKey, bytesOf("00000000 00000010")}},
+                                           errors);
+  EXPECT_TRUE(errors->reports.empty());
+  const std::shared_ptr<GenericDescriptor> d = std::dynamic_pointer_cast<GenericDescriptor>(parsed.object);
+  ASSERT_NE(nullptr, d);
+  EXPECT_TRUE(d->hasLocators());
+  EXPECT_EQ(0u, d->getLocatorCount());
+  EXPECT_TRUE(d->hasGenericSubDescriptors());
+  EXPECT_EQ(0u, d->getGenericSubDescriptorCount());
+  const MXFPropertyMap coded = codeWith(factory, d);
+  ASSERT_EQ(1u, coded.count(locatorsKey));
+  EXPECT_EQ(bytesOf("00000000 00000010"), coded.at(locatorsKey));
+  ASSERT_EQ(1u, coded.count(genericSubDescriptorsKey));
+  EXPECT_EQ(bytesOf("00000000 00000010"), coded.at(genericSubDescriptorsKey));
+}
+
+TEST(GenericDescriptorFactory, AbsentOptionalVectorsStayAbsentAndAreNotWritten) {
+  const std::shared_ptr<RecordingErrorHandler> errors = std::make_shared<RecordingErrorHandler>();
+  GenericDescriptorFactory factory;
+  const MXFParsedObject parsed = parseWith(factory, {{MXFInstanceUIDKey, uid(0x11)}}, errors);
+  EXPECT_TRUE(errors->reports.empty());
+  const std::shared_ptr<GenericDescriptor> d = std::dynamic_pointer_cast<GenericDescriptor>(parsed.object);
+  ASSERT_NE(nullptr, d);
+  EXPECT_FALSE(d->hasLocators());
+  EXPECT_FALSE(d->hasGenericSubDescriptors());
+  const MXFPropertyMap coded = codeWith(factory, d);
+  EXPECT_EQ(0u, coded.count(locatorsKey));
+  EXPECT_EQ(0u, coded.count(genericSubDescriptorsKey));
 }
 
 TEST(GenericDescriptor, InsertLocatorAtKeepsOrderAndTakesOwnership) {
