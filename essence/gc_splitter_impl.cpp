@@ -64,9 +64,7 @@ bool MXFGCSplitterImpl::inEssence() const { return state_ == essenceOnly || stat
 // Nothing in the stream marks an edit unit: it begins where the first key of
 // the stream comes again.
 void MXFGCSplitterImpl::editUnitBoundary(const KLVKey& key) {
-  const bool unset = std::all_of(firstKey_.octets().begin(), firstKey_.octets().end(),
-                                 [](std::uint8_t octet) { return octet == 0; });
-  if (unset) {
+  if (firstKey_ == KLVKey()) {
     firstKey_ = key;
     if (structureHandler) structureHandler->startEditUnit();
     return;
@@ -157,6 +155,8 @@ bool MXFGCSplitterImpl::offerEssence(const KLVKey& key, std::uint64_t length) {
   return true;
 }
 
+// The key tests are asked again: a subclass may answer differently now, and a
+// key of no kind is refused ("valid GC essence element key").
 void MXFGCSplitterImpl::deliver(const KLVKey& key, const std::uint8_t* bytes, std::uint64_t length) {
   switch (kindOf(key)) {
     case picture:

@@ -36,7 +36,6 @@ public:
   void endLocalSet(const KLVKey& key);
   void endFixedPack(const KLVKey& key);
   void endVariablePack(const KLVKey& key);
-  void systemValue(const std::uint8_t* data, std::streamsize size);
 
   void value(const std::uint8_t* data, std::streamsize size);
   bool invalidElement(const KLVKey& key);

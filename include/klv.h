@@ -693,10 +693,10 @@ private:
 // ---------------------------------------------------------------------------
 // Position filters and the fill item key check
 
-// What counting a position needs of the coding, for KLVTeller and
-// KLVMonitor: the octets of the key and length before a value, of the tag and
-// length before an item, and the length of a value that the handler declined,
-// which the position passes at the element's end.
+// What counting a position needs of the coding, for KLVCountingFilter: the
+// octets of the key and length before a value, of the tag and length before
+// an item, and the length of a value that the handler declined, which the
+// position passes at the element's end.
 class KLVPrefixCount {
 public:
   static constexpr std::streamoff keyOctets = 16;
@@ -726,18 +726,14 @@ private:
   std::uint64_t skipped_ = 0;
 };
 
-// Takes the position from the input stream at the ends of a stream and counts
-// it from the coding at the events between; the position at a start event is
-// the first octet of the value.
-class KLVTeller : public DullKLVFilter {
+// The events of KLVTeller and KLVMonitor: each start moves the position past
+// the key and length or the tag and length, each value past its octets, and
+// each end past a value that the handler declined; how a move is made is the
+// subclass's.
+class KLVCountingFilter : public DullKLVFilter {
 public:
-  KLVTeller(std::istream& stream, KLVHandler* handler = nullptr);
-  Locator* getLocator();
+  explicit KLVCountingFilter(KLVHandler* handler) : DullKLVFilter(handler) {}
 
-  void setLocator(Locator* locator) override;
-  void startStream(bool hasAccurateLengths) override;
-  void endStream(bool aborted) override;
-  void setLengthForm(std::uint8_t form) override;
   bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
   void endIndividualItem(const KLVKey& key) override;
   bool startLabel(const KLVKey& key) override;
@@ -759,19 +755,40 @@ public:
   void endWrapper(const KLVKey& key) override;
   void value(const std::uint8_t* data, std::streamsize size) override;
 
+protected:
+  virtual void advance(std::streamoff octets) = 0;
+  // Moves past a declined value.
+  void endElement() { advance(count_.takeSkipped()); }
+
+  KLVPrefixCount count_;
+};
+
+// Takes the position from the input stream at the ends of a stream and counts
+// it from the coding at the events between; the position at a start event is
+// the first octet of the value.
+class KLVTeller : public KLVCountingFilter {
+public:
+  KLVTeller(std::istream& stream, KLVHandler* handler = nullptr);
+  Locator* getLocator();
+
+  void setLocator(Locator* locator) override;
+  void startStream(bool hasAccurateLengths) override;
+  void endStream(bool aborted) override;
+  void setLengthForm(std::uint8_t form) override;
+
+protected:
+  void advance(std::streamoff octets) override;
+
 private:
   void refresh();
-  void advance(std::streamoff octets);
-  void endElement();
   std::istream* stream_;
   InputLocator locator_;
   // A position of -1 is told instead.
   std::streamoff position_ = -1;
-  KLVPrefixCount count_;
 };
 
 // Computes the position from the events alone, for pipes and output chains.
-class KLVMonitor : public DullKLVFilter {
+class KLVMonitor : public KLVCountingFilter {
 public:
   class MonitoredLocator : public Locator {
   public:
@@ -793,32 +810,12 @@ public:
   void startStream(bool hasAccurateLengths) override;
   void endStream(bool aborted) override;
   void setLengthForm(std::uint8_t form) override;
-  bool startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
-  void endIndividualItem(const KLVKey& key) override;
-  bool startLabel(const KLVKey& key) override;
-  void endLabel(const KLVKey& key) override;
-  bool startUniversalSet(const KLVKey& key, std::uint64_t length) override;
-  void endUniversalSet(const KLVKey& key) override;
-  bool startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
-                     KLVLengthType lengthType) override;
-  void endLocalSet(const KLVKey& key) override;
-  bool startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) override;
-  void endLocalItem(std::uint32_t tag) override;
-  bool startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
-  void endFixedLengthPack(const KLVKey& key) override;
-  bool startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) override;
-  void endVariableLengthPack(const KLVKey& key) override;
-  bool startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) override;
-  void endVariableLengthItem() override;
-  bool startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) override;
-  void endWrapper(const KLVKey& key) override;
-  void value(const std::uint8_t* data, std::streamsize size) override;
+
+protected:
+  void advance(std::streamoff octets) override;
 
 private:
-  void endElement();
-
   MonitoredLocator locator_;
-  KLVPrefixCount count_;
 };
 
 // Warns once per stream of a fill item key whose version octet is not the

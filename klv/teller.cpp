@@ -1,6 +1,6 @@
 #include "klv.h"
 
-KLVTeller::KLVTeller(std::istream& stream, KLVHandler* handler) : DullKLVFilter(handler), stream_(&stream) {}
+KLVTeller::KLVTeller(std::istream& stream, KLVHandler* handler) : KLVCountingFilter(handler), stream_(&stream) {}
 
 Locator* KLVTeller::getLocator() { return &locator_; }
 
@@ -34,9 +34,6 @@ void KLVTeller::advance(std::streamoff octets) {
   locator_.setPosition(position_);
 }
 
-// A declined value is never seen here; its length is added at the end event.
-void KLVTeller::endElement() { advance(count_.takeSkipped()); }
-
 void KLVTeller::setLocator(Locator* locator) {
   refresh();
   DullKLVFilter::setLocator(locator);
@@ -66,103 +63,4 @@ void KLVTeller::setLengthForm(std::uint8_t form) {
     locator_.setPosition(position_ + count_.currentPrefix());
   }
   DullKLVFilter::setLengthForm(form);
-}
-
-bool KLVTeller::startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
-  advance(count_.elementPrefix());
-  return count_.noteStart(DullKLVFilter::startIndividualItem(key, length, buffer), length);
-}
-
-void KLVTeller::endIndividualItem(const KLVKey& key) {
-  endElement();
-  DullKLVFilter::endIndividualItem(key);
-}
-
-bool KLVTeller::startLabel(const KLVKey& key) {
-  advance(KLVPrefixCount::keyOctets);
-  return DullKLVFilter::startLabel(key);
-}
-
-void KLVTeller::endLabel(const KLVKey& key) {
-  advance(0);
-  DullKLVFilter::endLabel(key);
-}
-
-bool KLVTeller::startUniversalSet(const KLVKey& key, std::uint64_t length) {
-  advance(count_.elementPrefix());
-  return count_.noteStart(DullKLVFilter::startUniversalSet(key, length), length);
-}
-
-void KLVTeller::endUniversalSet(const KLVKey& key) {
-  endElement();
-  DullKLVFilter::endUniversalSet(key);
-}
-
-bool KLVTeller::startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType, KLVLengthType lengthType) {
-  advance(count_.elementPrefix());
-  count_.startItems(KLVTagTypeOctets(tagType), lengthType);
-  return count_.noteStart(DullKLVFilter::startLocalSet(key, length, tagType, lengthType), length);
-}
-
-void KLVTeller::endLocalSet(const KLVKey& key) {
-  endElement();
-  count_.endItems();
-  DullKLVFilter::endLocalSet(key);
-}
-
-bool KLVTeller::startLocalItem(std::uint32_t tag, std::uint64_t length, std::uint8_t*& buffer) {
-  advance(count_.itemPrefix());
-  return count_.noteStart(DullKLVFilter::startLocalItem(tag, length, buffer), length);
-}
-
-void KLVTeller::endLocalItem(std::uint32_t tag) {
-  endElement();
-  DullKLVFilter::endLocalItem(tag);
-}
-
-bool KLVTeller::startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
-  advance(count_.elementPrefix());
-  return count_.noteStart(DullKLVFilter::startFixedLengthPack(key, length, buffer), length);
-}
-
-void KLVTeller::endFixedLengthPack(const KLVKey& key) {
-  endElement();
-  DullKLVFilter::endFixedLengthPack(key);
-}
-
-bool KLVTeller::startVariableLengthPack(const KLVKey& key, std::uint64_t length, KLVLengthType lengthType) {
-  advance(count_.elementPrefix());
-  count_.startItems(0, lengthType);
-  return count_.noteStart(DullKLVFilter::startVariableLengthPack(key, length, lengthType), length);
-}
-
-void KLVTeller::endVariableLengthPack(const KLVKey& key) {
-  endElement();
-  count_.endItems();
-  DullKLVFilter::endVariableLengthPack(key);
-}
-
-bool KLVTeller::startVariableLengthItem(std::uint64_t length, std::uint8_t*& buffer) {
-  advance(count_.itemPrefix());
-  return count_.noteStart(DullKLVFilter::startVariableLengthItem(length, buffer), length);
-}
-
-void KLVTeller::endVariableLengthItem() {
-  endElement();
-  DullKLVFilter::endVariableLengthItem();
-}
-
-bool KLVTeller::startWrapper(const KLVKey& key, std::uint64_t length, bool isWrapper, std::uint8_t*& buffer) {
-  advance(count_.elementPrefix());
-  return count_.noteStart(DullKLVFilter::startWrapper(key, length, isWrapper, buffer), length);
-}
-
-void KLVTeller::endWrapper(const KLVKey& key) {
-  endElement();
-  DullKLVFilter::endWrapper(key);
-}
-
-void KLVTeller::value(const std::uint8_t* data, std::streamsize size) {
-  advance(size);
-  DullKLVFilter::value(data, size);
 }
