@@ -1,18 +1,21 @@
-#include <iomanip>
 #include <ostream>
 
 #include "klv.h"
 
+// Spelled out digit by digit: no flag, width, fill or locale of the client's
+// stream may change a key's form, and none of them is changed either. Like
+// any output that formats, it uses up the width.
 std::ostream& operator<<(std::ostream& out, const KLVKey& key) {
-  std::ios_base::fmtflags flags = out.flags();
-  char fill = out.fill();
-  out << std::hex << std::uppercase << std::setfill('0') << std::right;
+  static const char digits[] = "0123456789ABCDEF";
+  char text[KLVKey::size() * 3 - 1];
+  char* at = text;
   for (std::size_t i = 0; i < KLVKey::size(); ++i) {
-    if (i != 0) out << '.';
-    out << std::setw(2) << static_cast<unsigned>(key[i]);
+    if (i != 0) *at++ = '.';
+    *at++ = digits[key[i] >> 4];
+    *at++ = digits[key[i] & 0x0F];
   }
-  out.flags(flags);
-  out.fill(fill);
+  out.write(text, sizeof text);
+  out.width(0);
   return out;
 }
 

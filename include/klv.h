@@ -855,14 +855,15 @@ public:
   static std::unique_ptr<KLVElement> create(const KLVKey& key, std::istream& stream, KLVHandler& handler,
                                             std::uint8_t& currentForm, Locator& locator, bool seekable);
 
+  // The element kinds are the library's own; the class is abstract.
+  KLVElement(const KLVKey& key, std::istream& stream, KLVHandler& handler, std::uint8_t& currentForm,
+             Locator& locator, bool seekable);
   virtual ~KLVElement();
   virtual void parse() = 0;
 
   const KLVKey& getKey() const { return key_; }
 
 protected:
-  KLVElement(const KLVKey& key, std::istream& stream, KLVHandler& handler, std::uint8_t& currentForm,
-             Locator& locator, bool seekable);
 
   KLVKey key_;
   std::istream* stream_;

@@ -17,7 +17,6 @@ using zelta::klv::withOctet;
 
 namespace {
 
-
 // Group codings by the low three bits of key octet 5.
 constexpr std::uint8_t universalSetCoding = 1;
 constexpr std::uint8_t localSetCoding = 3;
@@ -38,34 +37,62 @@ std::uint64_t readItemLength(std::istream& stream, KLVLengthType lengthType, std
 
 }  // namespace
 
-std::unique_ptr<KLVElement> KLVElement::create(const KLVKey& key, std::istream& stream, KLVHandler& handler,
-                                               std::uint8_t& currentForm, Locator& locator, bool seekable) {
+namespace {
+
+template <typename Element>
+struct Kind {
+  using type = Element;
+};
+
+// Calls make with the kind of element that key octets 4 and 5 select.
+template <typename Make>
+decltype(auto) withKind(const KLVKey& key, Make&& make) {
   if (std::memcmp(key.data(), smptePrefix, sizeof smptePrefix) != 0)
-    throw parse_error(klvCodingErrorId, withKey("invalid SMPTE key", key));
+    throw KLVElement::parse_error(klvCodingErrorId, withKey("invalid SMPTE key", key));
   switch (key[4]) {
     case 1:
-      return std::unique_ptr<KLVElement>(new KLVIndividualItem(key, stream, handler, currentForm, locator, seekable));
+      return make(Kind<KLVIndividualItem>());
     case 2:
       switch (key[5] & 7) {
         case universalSetCoding:
-          return std::unique_ptr<KLVElement>(new KLVUniversalSet(key, stream, handler, currentForm, locator, seekable));
+          return make(Kind<KLVUniversalSet>());
         case localSetCoding:
-          return std::unique_ptr<KLVElement>(new KLVLocalSet(key, stream, handler, currentForm, locator, seekable));
+          return make(Kind<KLVLocalSet>());
         case variableLengthPackCoding:
-          return std::unique_ptr<KLVElement>(
-              new KLVVariableLengthPack(key, stream, handler, currentForm, locator, seekable));
+          return make(Kind<KLVVariableLengthPack>());
         case fixedLengthPackCoding:
-          return std::unique_ptr<KLVElement>(
-              new KLVFixedLengthPack(key, stream, handler, currentForm, locator, seekable));
+          return make(Kind<KLVFixedLengthPack>());
       }
       break;
     case 3:
-      return std::unique_ptr<KLVElement>(new KLVWrapper(key, stream, handler, currentForm, locator, seekable));
+      return make(Kind<KLVWrapper>());
     case 4:
-      return std::unique_ptr<KLVElement>(new KLVLabel(key, stream, handler, currentForm, locator, seekable));
+      return make(Kind<KLVLabel>());
   }
-  throw parse_error(klvCodingErrorId, withKey("unimplemented SMPTE KLV coding", key));
+  throw KLVElement::parse_error(klvCodingErrorId, withKey("unimplemented SMPTE KLV coding", key));
 }
+
+}  // namespace
+
+std::unique_ptr<KLVElement> KLVElement::create(const KLVKey& key, std::istream& stream, KLVHandler& handler,
+                                               std::uint8_t& currentForm, Locator& locator, bool seekable) {
+  return withKind(key, [&](auto kind) -> std::unique_ptr<KLVElement> {
+    using Element = typename decltype(kind)::type;
+    return std::make_unique<Element>(key, stream, handler, currentForm, locator, seekable);
+  });
+}
+
+namespace zelta::klv {
+
+void parseElement(const KLVKey& key, std::istream& stream, KLVHandler& handler, std::uint8_t& currentForm,
+                  Locator& locator, bool seekable) {
+  withKind(key, [&](auto kind) {
+    typename decltype(kind)::type element(key, stream, handler, currentForm, locator, seekable);
+    element.parse();
+  });
+}
+
+}  // namespace zelta::klv
 
 void KLVIndividualItem::parse() {
   const std::uint64_t length = readBERLength(*stream_, *currentForm_, *handler_);
@@ -110,7 +137,7 @@ void KLVUniversalSet::parse() {
   } else {
     const std::streampos start = locator_->getPosition();
     while (octetsSince(*locator_, start) < length)
-      create(readKey(*stream_), *stream_, *handler_, *currentForm_, *locator_, seekable_)->parse();
+      zelta::klv::parseElement(readKey(*stream_), *stream_, *handler_, *currentForm_, *locator_, seekable_);
     if (octetsSince(*locator_, start) != length) throw parse_error(klvLengthErrorId, "incorrect universal set length");
   }
   handler_->endUniversalSet(key_);

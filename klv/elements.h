@@ -55,4 +55,14 @@ public:
   void parse() override;
 };
 
+namespace zelta::klv {
+
+// Makes the element that the key selects and parses it, as
+// KLVElement::create and parse() would, without the heap: a read makes one
+// element for every KLV element of a file.
+void parseElement(const KLVKey& key, std::istream& stream, KLVHandler& handler, std::uint8_t& currentForm,
+                  Locator& locator, bool seekable);
+
+}  // namespace zelta::klv
+
 #endif

@@ -1,6 +1,8 @@
 #include <memory>
 
 #include "klv.h"
+#include "klv/elements.h"
+#include "klv/file_read_ahead.h"
 #include "klv/stream_input.h"
 
 namespace {
@@ -25,11 +27,10 @@ PositionFilter makePositionFilter(std::istream& stream, bool seekable, KLVHandle
 void readElements(std::istream& stream, std::streampos stop, KLVHandler& handler, Locator& locator, bool seekable) {
   std::uint8_t currentForm = KLVNoLengthForm;
   for (;;) {
-    const KLVKey key = zelta::klv::readKey(stream);
-    KLVElement::create(key, stream, handler, currentForm, locator, seekable)->parse();
+    zelta::klv::parseElement(zelta::klv::readKey(stream), stream, handler, currentForm, locator, seekable);
     check(stream.good(), "successful parse() implies input stream is good");
     if (stop != std::streampos(-1) && std::streamoff(stop) <= std::streamoff(locator.getPosition())) return;
-    if (stream.peek() == std::istream::traits_type::eof()) return;
+    if (zelta::klv::atEnd(stream)) return;
   }
 }
 
@@ -83,6 +84,7 @@ void GenericKLVReader::read(std::istream& stream) { read(stream, std::streampos(
 void GenericKLVReader::read(std::istream& stream, std::streampos stop) {
   KLVHandler* client = getHandler();
   if (!stream.good()) failBadStream(errorHandler_);
+  const zelta::klv::ReadAheadScope readAhead(stream);
   KLVFillItemKeyFilter fillFilter(client, getFillItemKeyVersion(stream), errorHandler_);
   const bool seekable = zelta::klv::isSeekable(stream);
   PositionFilter position = makePositionFilter(stream, seekable, &fillFilter);

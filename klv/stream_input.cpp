@@ -2,7 +2,10 @@
 
 #include <algorithm>
 #include <array>
+#include <cstring>
 #include <limits>
+
+#include "klv/get_area.h"
 
 namespace zelta::klv {
 
@@ -11,6 +14,14 @@ namespace {
 constexpr std::streamsize chunkOctets = 65536;
 constexpr std::uint64_t largestOffset = static_cast<std::uint64_t>(std::numeric_limits<std::streamoff>::max());
 
+// What the stream's buffer holds ahead, or 0 when the stream may not be read.
+std::streamsize buffered(std::istream& stream) {
+  std::streambuf* buffer = stream.rdbuf();
+  return stream.rdstate() == std::ios_base::goodbit && buffer ? GetArea::available(*buffer) : 0;
+}
+
+// A seek would throw away what the stream's buffer holds; a skip that ends
+// inside it is made there.
 void seekForward(std::istream& stream, std::streamoff octets) {
   stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
   stream.seekg(octets, std::ios_base::cur);
@@ -25,10 +36,13 @@ void ignoreForward(std::istream& stream, std::streamsize octets) {
 }
 
 void skipPiece(std::istream& stream, std::streamoff octets, bool seekable) {
-  if (seekable)
+  if (octets <= buffered(stream)) {
+    GetArea::move(*stream.rdbuf(), octets);
+  } else if (seekable) {
     seekForward(stream, octets);
-  else
+  } else {
     ignoreForward(stream, octets);
+  }
 }
 
 }  // namespace
@@ -44,6 +58,12 @@ bool isSeekable(std::istream& stream) {
 }
 
 void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n) {
+  if (n <= buffered(stream)) {
+    if (n == 0) return;
+    std::memcpy(octets, GetArea::next(*stream.rdbuf()), static_cast<std::size_t>(n));
+    GetArea::move(*stream.rdbuf(), n);
+    return;
+  }
   stream.read(reinterpret_cast<char*>(octets), n);
   if (stream.gcount() != n) throw KLVElement::parse_error(streamFailureId, "unsuccessful read()");
 }
@@ -62,6 +82,10 @@ KLVKey readKey(std::istream& stream) {
   return key;
 }
 
+bool atEnd(std::istream& stream) {
+  return buffered(stream) == 0 && stream.peek() == std::istream::traits_type::eof();
+}
+
 void takeValue(std::istream& stream, KLVHandler& handler, std::uint64_t length, std::uint8_t* buffer) {
   if (buffer) {
     const std::streamsize size = static_cast<std::streamsize>(length);
@@ -69,11 +93,21 @@ void takeValue(std::istream& stream, KLVHandler& handler, std::uint64_t length, 
     handler.value(buffer, size);
     return;
   }
+  // What the stream holds already goes to the handler from where it lies.
   std::array<std::uint8_t, chunkOctets> chunk;
   while (length > 0) {
     const std::streamsize n = static_cast<std::streamsize>(std::min<std::uint64_t>(length, chunkOctets));
-    readOctets(stream, chunk.data(), n);
-    handler.value(chunk.data(), n);
+    if (n <= buffered(stream)) {
+      // The stream moves first, so that it stands behind the octets, as
+      // after a read, while the handler has them.
+      std::streambuf& source = *stream.rdbuf();
+      const auto* held = reinterpret_cast<const std::uint8_t*>(GetArea::next(source));
+      GetArea::move(source, n);
+      handler.value(held, n);
+    } else {
+      readOctets(stream, chunk.data(), n);
+      handler.value(chunk.data(), n);
+    }
     length -= static_cast<std::uint64_t>(n);
   }
 }

@@ -17,18 +17,23 @@ inline constexpr std::uint8_t smptePrefix[4] = {0x06, 0x0E, 0x2B, 0x34};
 // does not answer -1. A buffer that cannot is read as a pipe.
 bool isSeekable(std::istream& stream);
 
-// Exactly n octets ("unsuccessful read()").
+// Exactly n octets ("unsuccessful read()"): from the stream's buffer when it
+// holds them, else by one read of the stream.
 void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n);
 // A big-endian number of 1 to 8 octets.
 std::uint64_t readBigEndian(std::istream& stream, unsigned octets);
 // A key of 16 octets.
 KLVKey readKey(std::istream& stream);
+// Whether no octet follows; asks the stream only when its buffer is empty.
+bool atEnd(std::istream& stream);
 
-// Delivers a value that the handler took: into its buffer with one read and
-// one value event, else in chunks from a buffer of our own.
+// Delivers a value that the handler took: into its buffer with one read or
+// copied from the stream's buffer, and one value event; else in chunks of at
+// most 64 KiB, from where the stream's buffer holds them or from a buffer of
+// our own.
 void takeValue(std::istream& stream, KLVHandler& handler, std::uint64_t length, std::uint8_t* buffer);
-// Passes over a declined value: by relative seek when the stream can seek,
-// else by ignore().
+// Passes over a declined value: inside the stream's buffer when it ends
+// there, else by relative seek when the stream can seek, else by ignore().
 void skipValue(std::istream& stream, std::uint64_t length, bool seekable);
 // takeValue when taken, else skipValue.
 void transferValue(std::istream& stream, KLVHandler& handler, bool taken, std::uint64_t length, std::uint8_t* buffer,

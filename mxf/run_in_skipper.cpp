@@ -2,6 +2,7 @@
 #include <stdexcept>
 #include <string>
 
+#include "klv/get_area.h"
 #include "klv/stream_input.h"
 #include "mxf.h"
 
@@ -42,8 +43,13 @@ std::uint32_t MXFRunInSkipper::skip(std::istream& stream, std::uint32_t maximum)
     if (stream.good() || stream.eof()) fatal(runInErrorId, "invalid run-in");
     fatal(streamFailureId, "unsuccessful get()");
   }
-  // The key goes back to the stream, for the KLV reader to find.
-  if (zelta::klv::isSeekable(stream)) {
+  // The key goes back to the stream, for the KLV reader to find: within the
+  // stream's buffer when it still holds it, as a seek would throw the buffer
+  // away.
+  std::streambuf& buffer = *stream.rdbuf();
+  if (zelta::klv::GetArea::behind(buffer) >= static_cast<std::streamsize>(targetOctets)) {
+    zelta::klv::GetArea::move(buffer, -static_cast<std::streamoff>(targetOctets));
+  } else if (zelta::klv::isSeekable(stream)) {
     stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
     stream.seekg(-static_cast<std::streamoff>(targetOctets), std::ios_base::cur);
     if (stream.fail()) fatal(streamFailureId, "unsuccessful seekg()");

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <iomanip>
+#include <locale>
 #include <map>
 #include <sstream>
 
@@ -101,6 +102,28 @@ TEST(KLVKey, PrintingUnderHexAndLeftFlagsStillPadsWithZeros) {
   out.str("");
   out << 171;
   EXPECT_EQ(out.str(), "ab");
+}
+
+TEST(KLVKey, PrintingUnderShowbaseUppercaseWidthAndFillKeepsItsForm) {
+  std::ostringstream out;
+  out << std::hex << std::showbase << std::nouppercase << std::showpos << std::internal << std::setfill('#');
+  const std::ios_base::fmtflags before = out.flags();
+  out << std::setw(60) << keyOf(pictureKey);
+  EXPECT_EQ(out.str(), pictureKey);
+  EXPECT_EQ(out.flags(), before);
+  EXPECT_EQ(out.fill(), '#');
+  EXPECT_EQ(out.width(), 0);
+}
+
+TEST(KLVKey, PrintingUnderAGroupingLocaleKeepsItsForm) {
+  struct Grouping : std::numpunct<char> {
+    char do_thousands_sep() const override { return ','; }
+    std::string do_grouping() const override { return "\1"; }
+  };
+  std::ostringstream out;
+  out.imbue(std::locale(out.getloc(), new Grouping));
+  out << keyOf(pictureKey);
+  EXPECT_EQ(out.str(), pictureKey);
 }
 
 TEST(KLVKey, DefaultIsAllZeros) { EXPECT_EQ(toString(KLVKey()), "00.00.00.00.00.00.00.00.00.00.00.00.00.00.00.00"); }

@@ -74,7 +74,9 @@ ByteVector counting(std::size_t count) {
 
 }  // namespace
 
-TEST(GenericKLVReaderStreamAccess, HandlerBufferGetsExactlyOneStreamReadPerValue) {
+// A value that the stream's buffer holds costs no read at all; here the
+// buffer holds one octet at a time, so only the empty value comes without.
+TEST(GenericKLVReaderStreamAccess, HandlerBufferGetsAtMostOneStreamReadPerValue) {
   const ByteVector big = counting(300000);
   const ByteVector bytes =
       join({bytesOf(itemKey), bytesOf("83 04 93 e0"), big, bytesOf(localSetKey),
@@ -84,7 +86,7 @@ TEST(GenericKLVReaderStreamAccess, HandlerBufferGetsExactlyOneStreamReadPerValue
   GenericKLVReader reader;
   reader.setHandler(&handler);
   reader.read(stream);
-  EXPECT_EQ(handler.readsPerValue, (std::vector<int>{1, 1, 1, 1}));
+  EXPECT_EQ(handler.readsPerValue, (std::vector<int>{1, 1, 1, 0}));
   EXPECT_EQ(handler.values, join({big, bytesOf("aa bb cc dd ee")}));
 }
 

@@ -221,14 +221,21 @@ TEST(KLVTellerCount, SkipBeyondTheEndIsCountedAsTheStreamTellsIt) {
   EXPECT_EQ(read.events.back(), "endStream 0");
 }
 
+// Whatever buffer the client gave its file stream: small, the stream's own,
+// and large.
 TEST(KLVTellerCount, CountedPositionIsTheToldPositionOnEveryDataFile) {
   for (const std::string& path : dataFiles()) {
     for (const auto policy : everyPolicy) {
-      SCOPED_TRACE(path + " policy " + std::to_string(policy));
-      std::ifstream stream(path, std::ios::binary);
-      const TellingRead read = readTelling(stream, policy);
-      EXPECT_EQ(read.mismatches, std::vector<std::string>());
-      EXPECT_GT(read.compared, 2);
+      for (const std::size_t bufferSize : {std::size_t(256), std::size_t(0), std::size_t(1) << 20}) {
+        SCOPED_TRACE(path + " policy " + std::to_string(policy) + " buffer " + std::to_string(bufferSize));
+        std::vector<char> buffer(bufferSize);
+        std::ifstream stream;
+        if (bufferSize != 0) stream.rdbuf()->pubsetbuf(buffer.data(), static_cast<std::streamsize>(bufferSize));
+        stream.open(path, std::ios::binary);
+        const TellingRead read = readTelling(stream, policy);
+        EXPECT_EQ(read.mismatches, std::vector<std::string>());
+        EXPECT_GT(read.compared, 2);
+      }
     }
   }
 }

@@ -59,16 +59,28 @@ public:
   }
 };
 
-// Answers where it is, but refuses to move.
-class UnmovableBuffer : public PipeWithPutback {
+// Hands out one octet at a time and answers where it is, but refuses to
+// move.
+class UnmovableBuffer : public std::streambuf {
 public:
-  using PipeWithPutback::PipeWithPutback;
+  explicit UnmovableBuffer(const ByteVector& bytes) : bytes_(bytes) {}
 
 protected:
+  int_type underflow() override {
+    if (next_ == bytes_.size()) return traits_type::eof();
+    octet_ = static_cast<char>(bytes_[next_++]);
+    setg(&octet_, &octet_, &octet_ + 1);
+    return traits_type::to_int_type(octet_);
+  }
   pos_type seekoff(off_type off, std::ios_base::seekdir dir, std::ios_base::openmode) override {
-    if (off == 0 && dir == std::ios_base::cur) return pos_type(gptr() - eback());
+    if (off == 0 && dir == std::ios_base::cur) return pos_type(off_type(next_ - (egptr() - gptr())));
     return pos_type(off_type(-1));
   }
+
+private:
+  const ByteVector& bytes_;
+  std::size_t next_ = 0;
+  char octet_ = 0;
 };
 
 // Fails the device after some octets.
@@ -163,7 +175,23 @@ TEST(RunInSkipper, StreamThatIsNotGoodFails) {
             result.reports);
 }
 
-TEST(RunInSkipper, StreamThatCannotSeekGetsTheKeyBackOctetByOctet) {
+TEST(RunInSkipper, KeyGoesBackWithinTheStreamBufferWithoutASeek) {
+  const ByteVector bytes = concat({runIn(50), headerPack()});
+  zelta_test::klv::FileLikeStream stream(bytes, 4096);
+  EXPECT_EQ(50u, skip(stream).length);
+  EXPECT_EQ(0, stream.file().seeks());
+  EXPECT_EQ(toString(partitionKey(2, 4)), keyAt(stream));
+}
+
+TEST(RunInSkipper, KeyThatTheStreamBufferNoLongerHoldsComesBackByASeek) {
+  const ByteVector bytes = concat({runIn(50), headerPack()});
+  zelta_test::klv::FileLikeStream stream(bytes, 56);
+  EXPECT_EQ(50u, skip(stream).length);
+  EXPECT_EQ(1, stream.file().seeks());
+  EXPECT_EQ(toString(partitionKey(2, 4)), keyAt(stream));
+}
+
+TEST(RunInSkipper, StreamThatCannotSeekGetsTheKeyBack) {
   ByteVector bytes = concat({runIn(50), headerPack()});
   PipeWithPutback buffer(bytes);
   std::istream stream(&buffer);
@@ -180,7 +208,7 @@ TEST(RunInSkipper, FailedPutbackIsReported) {
 }
 
 TEST(RunInSkipper, FailedSeekIsReported) {
-  ByteVector bytes = concat({runIn(50), headerPack()});
+  const ByteVector bytes = concat({runIn(50), headerPack()});
   UnmovableBuffer buffer(bytes);
   std::istream stream(&buffer);
   const SkipResult result = skip(stream);

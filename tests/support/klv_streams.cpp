@@ -54,6 +54,58 @@ CountingStream::CountingStream(const ByteVector& bytes, Seeking seeking)
   init(&buffer_);
 }
 
+FileLikeStreambuf::FileLikeStreambuf(const ByteVector& bytes, std::size_t bufferSize)
+    : bytes_(bytes), buffer_(bufferSize) {
+  setg(buffer_.data(), buffer_.data(), buffer_.data());
+}
+
+std::streamsize FileLikeStreambuf::pull(char* s, std::streamsize n) {
+  const std::streamoff size = static_cast<std::streamoff>(bytes_.size());
+  const std::streamsize count = next_ >= size ? 0 : std::min<std::streamoff>(n, size - next_);
+  if (count > 0) std::memcpy(s, bytes_.data() + next_, static_cast<std::size_t>(count));
+  next_ += count;
+  octetsPulled_ += static_cast<std::uint64_t>(count);
+  ++pulls_;
+  return count;
+}
+
+FileLikeStreambuf::int_type FileLikeStreambuf::underflow() {
+  if (gptr() < egptr()) return traits_type::to_int_type(*gptr());
+  const std::streamsize count = pull(buffer_.data(), static_cast<std::streamsize>(buffer_.size()));
+  setg(buffer_.data(), buffer_.data(), buffer_.data() + count);
+  return count == 0 ? traits_type::eof() : traits_type::to_int_type(*gptr());
+}
+
+std::streamsize FileLikeStreambuf::xsgetn(char* s, std::streamsize n) {
+  if (n < static_cast<std::streamsize>(buffer_.size())) return std::streambuf::xsgetn(s, n);
+  const std::streamsize held = egptr() - gptr();
+  std::memcpy(s, gptr(), static_cast<std::size_t>(held));
+  setg(buffer_.data(), buffer_.data(), buffer_.data());
+  return held + pull(s + held, n - held);
+}
+
+FileLikeStreambuf::pos_type FileLikeStreambuf::seekoff(off_type off, std::ios_base::seekdir dir,
+                                                       std::ios_base::openmode) {
+  off_type target = off;
+  if (dir == std::ios_base::cur) target += position();
+  if (dir == std::ios_base::end) target += static_cast<off_type>(bytes_.size());
+  if (target < 0) return pos_type(off_type(-1));
+  if (dir == std::ios_base::cur && off == 0) return pos_type(target);
+  ++seeks_;
+  next_ = target;
+  setg(buffer_.data(), buffer_.data(), buffer_.data());
+  return pos_type(target);
+}
+
+FileLikeStreambuf::pos_type FileLikeStreambuf::seekpos(pos_type pos, std::ios_base::openmode which) {
+  return seekoff(off_type(pos), std::ios_base::beg, which);
+}
+
+FileLikeStream::FileLikeStream(const ByteVector& bytes, std::size_t bufferSize)
+    : std::istream(nullptr), buffer_(bytes, bufferSize) {
+  init(&buffer_);
+}
+
 ByteVector join(std::initializer_list<ByteVector> parts) {
   ByteVector out;
   for (const ByteVector& part : parts) out.insert(out.end(), part.begin(), part.end());

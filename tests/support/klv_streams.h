@@ -7,6 +7,7 @@
 #include <istream>
 #include <streambuf>
 #include <string>
+#include <vector>
 
 #include "klv.h"
 #include "support/recording.h"
@@ -50,6 +51,45 @@ public:
 
 private:
   CountingStreambuf buffer_;
+};
+
+// A file stream over spelled bytes, as the C++ library makes one: a buffer
+// of the given size that each underflow fills from the "file", reads larger
+// than the buffer straight into the caller's memory, and seeks that throw the
+// buffer away, but for the question where it stands. It counts what went to
+// the "file": octets, calls that brought octets, and seeks.
+class FileLikeStreambuf : public std::streambuf {
+public:
+  FileLikeStreambuf(const ByteVector& bytes, std::size_t bufferSize);
+  std::uint64_t octetsPulled() const { return octetsPulled_; }
+  int pulls() const { return pulls_; }
+  int seeks() const { return seeks_; }
+
+protected:
+  int_type underflow() override;
+  std::streamsize xsgetn(char* s, std::streamsize n) override;
+  pos_type seekoff(off_type off, std::ios_base::seekdir dir, std::ios_base::openmode which) override;
+  pos_type seekpos(pos_type pos, std::ios_base::openmode which) override;
+
+private:
+  std::streamoff position() const { return next_ - (egptr() - gptr()); }
+  std::streamsize pull(char* s, std::streamsize n);
+
+  const ByteVector& bytes_;
+  std::vector<char> buffer_;
+  std::streamoff next_ = 0;  // first octet not yet pulled
+  std::uint64_t octetsPulled_ = 0;
+  int pulls_ = 0;
+  int seeks_ = 0;
+};
+
+class FileLikeStream : public std::istream {
+public:
+  FileLikeStream(const ByteVector& bytes, std::size_t bufferSize);
+  const FileLikeStreambuf& file() const { return buffer_; }
+
+private:
+  FileLikeStreambuf buffer_;
 };
 
 ByteVector join(std::initializer_list<ByteVector> parts);
