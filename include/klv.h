@@ -637,7 +637,12 @@ public:
   explicit DullKLVFilter(KLVHandler* handler);
 
   void setHandler(KLVHandler* handler) override;
-  KLVHandler* getHandler() const override;
+  // The handler that it holds: every event of every filter asks for it, so
+  // it is answered here, and no subclass answers otherwise.
+  KLVHandler* getHandler() const final {
+    check(handler_ != nullptr, "handler is present");
+    return handler_;
+  }
 
   void setLocator(Locator* locator) override;
   void startStream(bool hasAccurateLengths) override;

@@ -6,11 +6,6 @@ DullKLVFilter::DullKLVFilter(KLVHandler* handler) : handler_(handler) {}
 
 void DullKLVFilter::setHandler(KLVHandler* handler) { handler_ = handler; }
 
-KLVHandler* DullKLVFilter::getHandler() const {
-  check(handler_ != nullptr, "handler is present");
-  return handler_;
-}
-
 void DullKLVFilter::setLocator(Locator* locator) { getHandler()->setLocator(locator); }
 
 void DullKLVFilter::startStream(bool hasAccurateLengths) { getHandler()->startStream(hasAccurateLengths); }

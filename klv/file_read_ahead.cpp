@@ -91,13 +91,14 @@ std::streamsize FileReadAhead::copyOut(char_type* s, std::streamsize n) {
   return count;
 }
 
-// The rest of a large value, with the read-ahead of what follows it. The
-// elements between two large values tend to repeat, as edit units do: the
-// read-ahead is as long as the last such run, so that the next run comes in
-// this same call.
-std::streamsize FileReadAhead::readDirect(char_type* s, std::streamsize n) {
-  const auto run = static_cast<std::size_t>(next_ - runStart_);
-  iovec pieces[2] = {{s, static_cast<std::size_t>(n)},
+// The rest of a large value, whose first held octets came from the
+// read-ahead, with the read-ahead of what follows it. The elements between
+// two large values tend to repeat, as edit units do: the read-ahead is as
+// long as the last such run, up to where its large value began, so that the
+// next run comes in this same call and the next large value's octets do not.
+std::streamsize FileReadAhead::readDirect(char_type* s, std::streamsize held, std::streamsize n) {
+  const auto run = static_cast<std::size_t>(next_ - held - runStart_);
+  iovec pieces[2] = {{s + held, static_cast<std::size_t>(n)},
                      {buffer_.get(), std::clamp(run + smallestPiece, smallestPiece, largestPiece)}};
   runStart_ = next_ + n;
   piece_ = smallestPiece;
@@ -115,7 +116,7 @@ std::streamsize FileReadAhead::readDirect(char_type* s, std::streamsize n) {
   std::streamsize count = got;
   while (count < n) {
     do {
-      got = ::pread(descriptor_, s + count, static_cast<std::size_t>(n - count), next_);
+      got = ::pread(descriptor_, s + held + count, static_cast<std::size_t>(n - count), next_);
     } while (got < 0 && errno == EINTR);
     if (got <= 0) break;
     next_ += got;
@@ -126,7 +127,7 @@ std::streamsize FileReadAhead::readDirect(char_type* s, std::streamsize n) {
 
 std::streamsize FileReadAhead::xsgetn(char_type* s, std::streamsize n) {
   std::streamsize count = copyOut(s, n);
-  if (n - count >= directOctets) return count + readDirect(s + count, n - count);
+  if (n - count >= directOctets) return count + readDirect(s, count, n - count);
   while (count < n && underflow() != traits_type::eof()) count += copyOut(s + count, n - count);
   return count;
 }

@@ -32,7 +32,7 @@ protected:
 
 private:
   std::streamsize copyOut(char_type* s, std::streamsize n);
-  std::streamsize readDirect(char_type* s, std::streamsize n);
+  std::streamsize readDirect(char_type* s, std::streamsize held, std::streamsize n);
   void drop();
 
   int descriptor_;

@@ -2,10 +2,8 @@
 
 #include <algorithm>
 #include <array>
-#include <cstring>
 #include <limits>
 
-#include "klv/get_area.h"
 
 namespace zelta::klv {
 
@@ -16,8 +14,8 @@ constexpr std::uint64_t largestOffset = static_cast<std::uint64_t>(std::numeric_
 
 // What the stream's buffer holds ahead, or 0 when the stream may not be read.
 std::streamsize buffered(std::istream& stream) {
-  std::streambuf* buffer = stream.rdbuf();
-  return stream.rdstate() == std::ios_base::goodbit && buffer ? GetArea::available(*buffer) : 0;
+  std::streambuf* buffer = heldBy(stream);
+  return buffer ? GetArea::available(*buffer) : 0;
 }
 
 // A seek would throw away what the stream's buffer holds; a skip that ends
@@ -57,13 +55,7 @@ bool isSeekable(std::istream& stream) {
   }
 }
 
-void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n) {
-  if (n <= buffered(stream)) {
-    if (n == 0) return;
-    std::memcpy(octets, GetArea::next(*stream.rdbuf()), static_cast<std::size_t>(n));
-    GetArea::move(*stream.rdbuf(), n);
-    return;
-  }
+void readFromStream(std::istream& stream, std::uint8_t* octets, std::streamsize n) {
   stream.read(reinterpret_cast<char*>(octets), n);
   if (stream.gcount() != n) throw KLVElement::parse_error(streamFailureId, "unsuccessful read()");
 }
@@ -74,12 +66,6 @@ std::uint64_t readBigEndian(std::istream& stream, unsigned octets) {
   std::uint64_t value = 0;
   for (unsigned i = 0; i < octets; ++i) value = (value << 8) | bytes[i];
   return value;
-}
-
-KLVKey readKey(std::istream& stream) {
-  KLVKey key;
-  readOctets(stream, key.data(), KLVKey::size());
-  return key;
 }
 
 bool atEnd(std::istream& stream) {

@@ -4,9 +4,11 @@
 #define ZELTA_KLV_STREAM_INPUT_H
 
 #include <cstdint>
+#include <cstring>
 #include <istream>
 
 #include "klv.h"
+#include "klv/get_area.h"
 
 namespace zelta::klv {
 
@@ -17,13 +19,37 @@ inline constexpr std::uint8_t smptePrefix[4] = {0x06, 0x0E, 0x2B, 0x34};
 // does not answer -1. A buffer that cannot is read as a pipe.
 bool isSeekable(std::istream& stream);
 
-// Exactly n octets ("unsuccessful read()"): from the stream's buffer when it
-// holds them, else by one read of the stream.
-void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n);
+// The stream's buffer when octets may be taken from what it holds, else
+// null.
+inline std::streambuf* heldBy(std::istream& stream) {
+  return stream.rdstate() == std::ios_base::goodbit ? stream.rdbuf() : nullptr;
+}
+
+// Exactly n octets by one read of the stream ("unsuccessful read()").
+void readFromStream(std::istream& stream, std::uint8_t* octets, std::streamsize n);
+
+// Exactly n octets: from the stream's buffer when it holds them, which is
+// where nearly every key and length comes from, else by one read.
+inline void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsize n) {
+  std::streambuf* buffer = heldBy(stream);
+  if (buffer && n <= GetArea::available(*buffer)) {
+    if (n == 0) return;
+    std::memcpy(octets, GetArea::next(*buffer), static_cast<std::size_t>(n));
+    GetArea::move(*buffer, n);
+    return;
+  }
+  readFromStream(stream, octets, n);
+}
+
 // A big-endian number of 1 to 8 octets.
 std::uint64_t readBigEndian(std::istream& stream, unsigned octets);
+
 // A key of 16 octets.
-KLVKey readKey(std::istream& stream);
+inline KLVKey readKey(std::istream& stream) {
+  KLVKey key;
+  readOctets(stream, key.data(), KLVKey::size());
+  return key;
+}
 // Whether no octet follows; asks the stream only when its buffer is empty.
 bool atEnd(std::istream& stream);
 

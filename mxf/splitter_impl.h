@@ -7,7 +7,7 @@
 
 #include "mxf.h"
 
-class MXFSplitter::Impl : public KLVHandler {
+class MXFSplitter::Impl final : public KLVHandler {
 public:
   Impl(MXFStructureHandler* structureHandler, KLVHandler* metadataHandler, KLVHandler* indexHandler,
        KLVHandler* essenceHandler, bool validate);
