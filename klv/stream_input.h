@@ -50,6 +50,16 @@ inline KLVKey readKey(std::istream& stream) {
   readOctets(stream, key.data(), KLVKey::size());
   return key;
 }
+// Moves back over octets just read when the stream's buffer still holds
+// them, which keeps the buffer that a seek would throw away; false, and no
+// move, when it does not.
+inline bool backWithinBuffer(std::istream& stream, std::streamoff octets) {
+  std::streambuf* buffer = stream.rdbuf();
+  if (!buffer || GetArea::behind(*buffer) < octets) return false;
+  GetArea::move(*buffer, -octets);
+  return true;
+}
+
 // Whether no octet follows; asks the stream only when its buffer is empty.
 bool atEnd(std::istream& stream);
 

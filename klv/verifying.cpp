@@ -119,8 +119,10 @@ namespace {
 
 constexpr std::streamoff prefixOctets = sizeof zelta::klv::smptePrefix;
 
-// Back to the first octet of the prefix just read.
+// Back to the first octet of the prefix just read: within the stream's
+// buffer when it still holds the prefix.
 void backUpOverPrefix(std::istream& stream) {
+  if (zelta::klv::backWithinBuffer(stream, prefixOctets)) return;
   if (zelta::klv::isSeekable(stream)) {
     stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
     stream.seekg(-prefixOctets, std::ios_base::cur);

@@ -2,7 +2,6 @@
 #include <stdexcept>
 #include <string>
 
-#include "klv/get_area.h"
 #include "klv/stream_input.h"
 #include "mxf.h"
 
@@ -46,10 +45,9 @@ std::uint32_t MXFRunInSkipper::skip(std::istream& stream, std::uint32_t maximum)
   // The key goes back to the stream, for the KLV reader to find: within the
   // stream's buffer when it still holds it, as a seek would throw the buffer
   // away.
-  std::streambuf& buffer = *stream.rdbuf();
-  if (zelta::klv::GetArea::behind(buffer) >= static_cast<std::streamsize>(targetOctets)) {
-    zelta::klv::GetArea::move(buffer, -static_cast<std::streamoff>(targetOctets));
-  } else if (zelta::klv::isSeekable(stream)) {
+  const auto runIn = static_cast<std::uint32_t>(count - targetOctets);
+  if (zelta::klv::backWithinBuffer(stream, static_cast<std::streamoff>(targetOctets))) return runIn;
+  if (zelta::klv::isSeekable(stream)) {
     stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
     stream.seekg(-static_cast<std::streamoff>(targetOctets), std::ios_base::cur);
     if (stream.fail()) fatal(streamFailureId, "unsuccessful seekg()");
@@ -59,5 +57,5 @@ std::uint32_t MXFRunInSkipper::skip(std::istream& stream, std::uint32_t maximum)
       if (stream.fail()) fatal(streamFailureId, "unsuccessful putback()");
     }
   }
-  return static_cast<std::uint32_t>(count - targetOctets);
+  return runIn;
 }

@@ -241,6 +241,14 @@ TEST(FindKey, MovesToTheNextKeyOnASeekableStream) {
   EXPECT_TRUE(stream.good());
 }
 
+TEST(FindKey, BacksUpWithinTheStreamBufferWithoutASeek) {
+  const ByteVector bytes = join({bytesOf("00 01 02"), bytesOf(itemKey)});
+  zelta_test::klv::FileLikeStream stream(bytes, 4096);
+  EXPECT_TRUE(findKey(stream, -1));
+  EXPECT_EQ(stream.tellg(), std::streampos(3));
+  EXPECT_EQ(stream.file().seeks(), 0);
+}
+
 TEST(FindKey, RestartsTheMatchOnA06) {
   const ByteVector bytes = bytesOf("06 0e 06 06 0e 2b 34 01");
   CountingStream stream(bytes);
