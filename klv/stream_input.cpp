@@ -60,12 +60,10 @@ void readFromStream(std::istream& stream, std::uint8_t* octets, std::streamsize 
   if (stream.gcount() != n) throw KLVElement::parse_error(streamFailureId, "unsuccessful read()");
 }
 
-std::uint64_t readBigEndian(std::istream& stream, unsigned octets) {
+std::uint64_t readBigEndianFromStream(std::istream& stream, unsigned octets) {
   std::array<std::uint8_t, 8> bytes;
-  readOctets(stream, bytes.data(), octets);
-  std::uint64_t value = 0;
-  for (unsigned i = 0; i < octets; ++i) value = (value << 8) | bytes[i];
-  return value;
+  readFromStream(stream, bytes.data(), octets);
+  return bigEndian(bytes.data(), octets);
 }
 
 bool atEnd(std::istream& stream) {

@@ -41,8 +41,25 @@ inline void readOctets(std::istream& stream, std::uint8_t* octets, std::streamsi
   readFromStream(stream, octets, n);
 }
 
-// A big-endian number of 1 to 8 octets.
-std::uint64_t readBigEndian(std::istream& stream, unsigned octets);
+// The number that 1 to 8 octets spell, the first the most significant.
+inline std::uint64_t bigEndian(const unsigned char* octets, unsigned count) {
+  std::uint64_t value = 0;
+  for (unsigned i = 0; i < count; ++i) value = (value << 8) | octets[i];
+  return value;
+}
+
+// A big-endian number of 1 to 8 octets by one read of the stream.
+std::uint64_t readBigEndianFromStream(std::istream& stream, unsigned octets);
+
+// A big-endian number of 1 to 8 octets, taken where the stream's buffer
+// holds it.
+inline std::uint64_t readBigEndian(std::istream& stream, unsigned octets) {
+  std::streambuf* buffer = heldBy(stream);
+  if (!buffer || octets > GetArea::available(*buffer)) return readBigEndianFromStream(stream, octets);
+  const std::uint64_t value = bigEndian(reinterpret_cast<const unsigned char*>(GetArea::next(*buffer)), octets);
+  GetArea::move(*buffer, octets);
+  return value;
+}
 
 // A key of 16 octets.
 inline KLVKey readKey(std::istream& stream) {
