@@ -1,6 +1,6 @@
-// What the read benchmarks share: a large temporary file that lives as long
-// as the process, the plain read() loop that they are measured against, and
-// the throughput counters.
+// What the read benchmarks share: large temporary files that live as long
+// as the process, the plain read() loop and the pread() walk of keys and
+// lengths that they are measured against, and the throughput counters.
 #ifndef ZELTA_BENCH_BENCH_FILES_H
 #define ZELTA_BENCH_BENCH_FILES_H
 
@@ -38,14 +38,21 @@ inline void removeBenchFiles() {
   for (const std::string& path : benchFilePaths()) std::remove(path.c_str());
 }
 
-// Writes a file under the temporary directory once per process, by the
-// writer given; the file is removed at exit.
-inline std::string writeBenchFile(const std::string& name, const std::function<void(std::ostream&)>& write) {
+// A path under the temporary directory for a file of this process, which
+// is removed at exit.
+inline std::string benchFilePath(const std::string& name) {
   const std::filesystem::path named(name);
   const std::string unique = named.stem().string() + "_" + std::to_string(::getpid()) + named.extension().string();
   const std::string path = (std::filesystem::temp_directory_path() / unique).string();
   if (benchFilePaths().empty()) std::atexit(removeBenchFiles);
   benchFilePaths().push_back(path);
+  return path;
+}
+
+// Writes a file under the temporary directory once per process, by the
+// writer given; the file is removed at exit.
+inline std::string writeBenchFile(const std::string& name, const std::function<void(std::ostream&)>& write) {
+  const std::string path = benchFilePath(name);
   std::ofstream out(path, std::ios::binary);
   write(out);
   out.close();
@@ -70,10 +77,8 @@ private:
   std::size_t next_ = 0;
 };
 
-// Opens the file with a stream buffer of the client's, or of the file
-// stream's own when the buffer is empty. A small one leaves the stream only
-// keys and lengths to read ahead, so that every value goes from the kernel
-// straight into the handler's buffer in one read() call.
+// Opens the file as a client does: with a stream buffer of its own set
+// before open, or, when the buffer is empty, with the file stream's own.
 inline void openWithStreamBuffer(std::ifstream& in, const std::string& path, std::vector<char>& streamBuffer) {
   if (!streamBuffer.empty())
     in.rdbuf()->pubsetbuf(streamBuffer.data(), static_cast<std::streamsize>(streamBuffer.size()));
@@ -101,6 +106,31 @@ inline void plainReadLoop(benchmark::State& state, const std::string& path, std:
     check(total == fileOctets, "whole bench file read");
     benchmark::DoNotOptimize(buffer.data());
     octets += total;
+  }
+  reportThroughput(state, octets, octets / elementOctets);
+}
+
+// The yardstick of a walk that skips values: pread() of each top-level
+// key and BER length, and a jump over the value, to the end of the file.
+inline void preadWalk(benchmark::State& state, const std::string& path, std::uint64_t fileOctets,
+                      std::uint64_t elementOctets) {
+  constexpr std::size_t prefixOctets = 16 + 9;
+  std::uint8_t prefix[prefixOctets];
+  std::uint64_t octets = 0;
+  for (auto _ : state) {
+    const int fd = ::open(path.c_str(), O_RDONLY);
+    check(fd >= 0, "bench file opened");
+    std::uint64_t at = 0;
+    for (ssize_t n; (n = ::pread(fd, prefix, prefixOctets, static_cast<off_t>(at))) > 16;) {
+      const std::uint8_t first = prefix[16];
+      const unsigned lengthOctets = (first & 0x80) ? (first & 0x7Fu) : 0u;
+      std::uint64_t length = (first & 0x80) ? 0 : first;
+      for (unsigned i = 0; i < lengthOctets; ++i) length = (length << 8) | prefix[17 + i];
+      at += 17 + lengthOctets + length;
+    }
+    ::close(fd);
+    check(at == fileOctets, "whole bench file walked");
+    octets += at;
   }
   reportThroughput(state, octets, octets / elementOctets);
 }

@@ -79,17 +79,17 @@ void BM_PlainReadLoop(benchmark::State& state) {
   zelta_bench::plainReadLoop(state, benchFile(), fileOctets, elementOctets);
 }
 
+void readerCases(benchmark::internal::Benchmark* benchmark) {
+  benchmark->ArgNames({"streamBuffer", "handlerBuffers"});
+  for (const std::int64_t streamBuffer : {256, 0, 65536, 1048576})
+    for (const std::int64_t handlerBuffers : {4, 0}) benchmark->Args({streamBuffer, handlerBuffers});
+  benchmark->Unit(benchmark::kMillisecond)->UseRealTime();
+}
+
 }  // namespace
 
 BENCHMARK(BM_PlainReadLoop)->Unit(benchmark::kMillisecond)->UseRealTime();
-BENCHMARK(BM_Reader)
-    ->ArgNames({"streamBuffer", "handlerBuffers"})
-    ->Args({256, 4})
-    ->Args({0, 4})
-    ->Args({0, 1})
-    ->Args({0, 0})
-    ->Unit(benchmark::kMillisecond)
-    ->UseRealTime();
+BENCHMARK(BM_Reader)->Apply(readerCases);
 BENCHMARK(BM_PlainReadLoop)->Unit(benchmark::kMillisecond)->UseRealTime();
 
 BENCHMARK_MAIN();

@@ -6,9 +6,11 @@ vector_streambuf::vector_streambuf() = default;
 
 vector_streambuf::vector_streambuf(const ByteVector& bytes) : vector_streambuf(bytes.data(), bytes.size()) {}
 
-vector_streambuf::vector_streambuf(const std::uint8_t* data, std::size_t size) {
-  // The get area is the vector itself: the stream reads in place and never
-  // writes through these pointers.
+vector_streambuf::vector_streambuf(const std::uint8_t* data, std::size_t size) { reset(data, size); }
+
+// The get area is the vector itself: the stream reads in place and never
+// writes through these pointers.
+void vector_streambuf::reset(const std::uint8_t* data, std::size_t size) {
   char* begin = const_cast<char*>(reinterpret_cast<const char*>(data));
   setg(begin, begin, begin + size);
 }
@@ -44,6 +46,41 @@ vector_istream::vector_istream(const ByteVector& bytes) : std::istream(nullptr),
 vector_istream::vector_istream(const std::uint8_t* data, std::size_t size)
     : std::istream(nullptr), buffer_(data, size) {
   init(&buffer_);
+}
+
+void vector_istream::reset(const ByteVector& bytes) {
+  buffer_.reset(bytes.data(), bytes.size());
+  clear();
+}
+
+namespace {
+
+struct Lender {
+  vector_istream stream{nullptr, 0};
+  bool lent = false;
+};
+
+Lender& lender() {
+  thread_local Lender kept;
+  return kept;
+}
+
+}  // namespace
+
+LentInput::LentInput(const ByteVector& bytes) {
+  Lender& kept = lender();
+  if (kept.lent) {
+    own_ = std::make_unique<vector_istream>(bytes);
+    stream_ = own_.get();
+    return;
+  }
+  kept.lent = true;
+  kept.stream.reset(bytes);
+  stream_ = &kept.stream;
+}
+
+LentInput::~LentInput() {
+  if (!own_) lender().lent = false;
 }
 
 void requireExhausted(std::istream& in) {

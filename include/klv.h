@@ -97,10 +97,16 @@ public:
   constexpr explicit KLVKeyPattern(const std::array<std::uint8_t, 16>& pattern)
       : pattern_(pattern), mask_(maskOf(pattern)) {}
 
+  // Every element of a file is matched against several families: eight
+  // octets at a time, without a branch per octet.
   bool matches(const KLVKey& key) const {
-    for (std::size_t i = 0; i < 16; ++i)
-      if (mask_[i] & (key[i] ^ pattern_[i])) return false;
-    return true;
+    std::uint64_t k[2];
+    std::uint64_t p[2];
+    std::uint64_t m[2];
+    std::memcpy(k, key.data(), 16);
+    std::memcpy(p, pattern_.data(), 16);
+    std::memcpy(m, mask_.data(), 16);
+    return (((k[0] ^ p[0]) & m[0]) | ((k[1] ^ p[1]) & m[1])) == 0;
   }
   const std::array<std::uint8_t, 16>& pattern() const { return pattern_; }
   const std::array<std::uint8_t, 16>& mask() const { return mask_; }
@@ -281,6 +287,8 @@ public:
   vector_streambuf();
   explicit vector_streambuf(const ByteVector& bytes);
   vector_streambuf(const std::uint8_t* data, std::size_t size);
+  // Reads other bytes from their start.
+  void reset(const std::uint8_t* data, std::size_t size);
 
 protected:
   pos_type seekoff(off_type off, std::ios_base::seekdir dir,
@@ -294,6 +302,8 @@ class vector_istream : public std::istream {
 public:
   explicit vector_istream(const ByteVector& bytes);
   vector_istream(const std::uint8_t* data, std::size_t size);
+  // Reads other bytes from their start, with a clear state.
+  void reset(const ByteVector& bytes);
 
 private:
   vector_streambuf buffer_;
@@ -393,11 +403,15 @@ inline void putOctet(std::ostream& out, std::uint8_t octet) {
   out.put(static_cast<char>(octet));
 }
 
+// One read of the stream for the whole number, not one per octet.
 template <typename T>
 T getBigEndian(std::istream& in) {
   typedef typename std::make_unsigned<T>::type U;
+  std::uint8_t octets[sizeof(T)];
+  in.read(reinterpret_cast<char*>(octets), sizeof(T));
+  check(in.gcount() == static_cast<std::streamsize>(sizeof(T)), "successful get()");
   U v = 0;
-  for (std::size_t i = 0; i < sizeof(T); ++i) v = static_cast<U>((v << 8) | getOctet(in));
+  for (std::size_t i = 0; i < sizeof(T); ++i) v = static_cast<U>((v << 8) | octets[i]);
   return static_cast<T>(v);
 }
 
@@ -504,13 +518,30 @@ namespace util {
 void requireExhausted(std::istream& in);
 // Requires the last write to have succeeded.
 void requireWritten(std::ostream& out);
+
+// The stream over a byte vector that internalize reads. Making a
+// std::istream looks up the locale's facets, which costs more than reading
+// most values: each thread keeps one stream and lends it out, and only an
+// internalize within another makes a stream of its own.
+class LentInput {
+public:
+  explicit LentInput(const ByteVector& bytes);
+  LentInput(const LentInput&) = delete;
+  LentInput& operator=(const LentInput&) = delete;
+  ~LentInput();
+  std::istream& stream() { return *stream_; }
+
+private:
+  std::unique_ptr<vector_istream> own_;
+  vector_istream* stream_;
+};
 }  // namespace util
 
 template <typename T>
 void internalize(const ByteVector& bytes, T& value) {
-  util::vector_istream in(bytes);
-  internalize(in, value);
-  util::requireExhausted(in);
+  util::LentInput in(bytes);
+  internalize(in.stream(), value);
+  util::requireExhausted(in.stream());
 }
 
 template <typename T>
@@ -718,9 +749,16 @@ public:
   std::streamoff currentPrefix() const { return itemLengthIsBER_ ? itemPrefix() : elementPrefix(); }
   unsigned lengthOctets() const { return lengthOctets_; }
   // Passes taken on, and keeps the length of a declined value.
-  bool noteStart(bool taken, std::uint64_t length);
+  bool noteStart(bool taken, std::uint64_t length) {
+    skipped_ = taken ? 0 : length;
+    return taken;
+  }
   // The declined length, once.
-  std::streamoff takeSkipped();
+  std::streamoff takeSkipped() {
+    const auto skipped = static_cast<std::streamoff>(skipped_);
+    skipped_ = 0;
+    return skipped;
+  }
   void reset();
 
 private:

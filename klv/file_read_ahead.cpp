@@ -14,10 +14,14 @@ namespace zelta::klv {
 
 namespace {
 
-// The first piece of read-ahead after a jump or a large value: about what
-// the keys and lengths of a few elements take, so that a walk that skips
-// large values reads little more than a walk of keys and lengths.
-constexpr std::size_t smallestPiece = 512;
+// The first piece of read-ahead after a jump: about what the keys and
+// lengths of a few elements take, so that a walk that skips large values
+// reads little more than a walk of keys and lengths.
+constexpr std::size_t smallestPiece = 128;
+// What the read-ahead that comes with a large value adds to the last run of
+// small elements: enough for fill items that vary with the alignment, little
+// of the next large value.
+constexpr std::size_t runMargin = 512;
 // Pieces double up to this while the elements stay small; the cost of a
 // system call is then small beside the copy.
 constexpr std::size_t largestPiece = std::size_t(128) << 10;
@@ -99,7 +103,7 @@ std::streamsize FileReadAhead::copyOut(char_type* s, std::streamsize n) {
 std::streamsize FileReadAhead::readDirect(char_type* s, std::streamsize held, std::streamsize n) {
   const auto run = static_cast<std::size_t>(next_ - held - runStart_);
   iovec pieces[2] = {{s + held, static_cast<std::size_t>(n)},
-                     {buffer_.get(), std::clamp(run + smallestPiece, smallestPiece, largestPiece)}};
+                     {buffer_.get(), std::clamp(run + runMargin, runMargin, largestPiece)}};
   runStart_ = next_ + n;
   piece_ = smallestPiece;
   ssize_t got;

@@ -13,17 +13,6 @@ void KLVPrefixCount::startItems(unsigned tagOctets, KLVLengthType lengthType) {
   itemLengthOctets_ = itemLengthIsBER_ ? lengthOctets_ : KLVFixedLengthTypeOctets(lengthType);
 }
 
-bool KLVPrefixCount::noteStart(bool taken, std::uint64_t length) {
-  skipped_ = taken ? 0 : length;
-  return taken;
-}
-
-std::streamoff KLVPrefixCount::takeSkipped() {
-  const std::streamoff skipped = static_cast<std::streamoff>(skipped_);
-  skipped_ = 0;
-  return skipped;
-}
-
 void KLVPrefixCount::reset() {
   itemLengthIsBER_ = false;
   skipped_ = 0;

@@ -4,7 +4,6 @@
 #include <array>
 #include <limits>
 
-
 namespace zelta::klv {
 
 namespace {
@@ -19,11 +18,14 @@ std::streamsize buffered(std::istream& stream) {
 }
 
 // A seek would throw away what the stream's buffer holds; a skip that ends
-// inside it is made there.
+// inside it is made there. A seek goes to the stream's buffer straight, as
+// seekg() would after lifting the end-of-file bit.
 void seekForward(std::istream& stream, std::streamoff octets) {
-  stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
-  stream.seekg(octets, std::ios_base::cur);
-  if (stream.fail()) throw KLVElement::parse_error(streamFailureId, "unsuccessful seekg()");
+  if (stream.eof()) stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
+  if (stream.fail() || stream.rdbuf()->pubseekoff(octets, std::ios_base::cur, std::ios_base::in) == std::streampos(-1)) {
+    stream.setstate(std::ios_base::failbit);
+    throw KLVElement::parse_error(streamFailureId, "unsuccessful seekg()");
+  }
 }
 
 void ignoreForward(std::istream& stream, std::streamsize octets) {
@@ -66,8 +68,14 @@ std::uint64_t readBigEndianFromStream(std::istream& stream, unsigned octets) {
   return bigEndian(bytes.data(), octets);
 }
 
+// As peek() would, without its sentry on a good stream: the end sets the
+// end-of-file bit.
 bool atEnd(std::istream& stream) {
-  return buffered(stream) == 0 && stream.peek() == std::istream::traits_type::eof();
+  std::streambuf* buffer = heldBy(stream);
+  if (!buffer) return stream.peek() == std::istream::traits_type::eof();
+  if (GetArea::available(*buffer) > 0 || buffer->sgetc() != std::istream::traits_type::eof()) return false;
+  stream.setstate(std::ios_base::eofbit);
+  return true;
 }
 
 void takeValue(std::istream& stream, KLVHandler& handler, std::uint64_t length, std::uint8_t* buffer) {

@@ -56,9 +56,12 @@ KLVHandler* MXFSplitter::Impl::delegate() const {
 
 std::streamoff MXFSplitter::Impl::position() { return locator_.getPosition(); }
 
+// By its offset: the conversion state of a position means nothing to a
+// binary stream, and a copy of the whole position right after the upstream
+// wrote it piecewise would stall the processor at every event.
 void MXFSplitter::Impl::storePosition() {
   check(upstream_ != nullptr, "has locator");
-  locator_.setPosition(upstream_->getPosition());
+  locator_.setPosition(std::streampos(std::streamoff(upstream_->getPosition())));
 }
 
 void MXFSplitter::Impl::fatal(const MXFUID& identifier, const std::string& message) {

@@ -65,6 +65,39 @@ TEST(Internalize, LongCompoundValuesFailValidExternalLength) {
             "assertion failure: valid external length");
 }
 
+// A value whose reading internalizes another value from octets of its own,
+// as a batch of compound items may.
+struct Nested {
+  std::uint16_t outer = 0;
+  std::uint32_t inner = 0;
+};
+
+void internalize(std::istream& in, Nested& value) {
+  internalize(in, value.outer);
+  ByteVector octets(4);
+  in.read(reinterpret_cast<char*>(octets.data()), 4);
+  internalize(octets, value.inner);
+}
+
+TEST(Internalize, ValueReadWithinAnotherReadKeepsBothStreams) {
+  Nested value;
+  internalize(bytesOf("01 02 0a 0b 0c 0d"), value);
+  EXPECT_EQ(value.outer, 0x0102);
+  EXPECT_EQ(value.inner, 0x0a0b0c0du);
+  EXPECT_EQ(failureOf([] {
+              Nested longer;
+              internalize(bytesOf("01 02 0a 0b 0c 0d ff"), longer);
+            }),
+            "assertion failure: valid external length");
+}
+
+TEST(Internalize, FailedReadLeavesNoStateForTheNext) {
+  std::uint32_t value = 0;
+  EXPECT_EQ(failureOf([&] { internalize(bytesOf("01 02 03"), value); }), "assertion failure: successful get()");
+  internalize(bytesOf("01 02 03 04"), value);
+  EXPECT_EQ(value, 0x01020304u);
+}
+
 TEST(Conversion, IntegersRoundTripBigEndian) {
   expectRoundTrip<std::uint8_t>(0xA5, "A5");
   expectRoundTrip<std::int8_t>(-2, "FE");
