@@ -13,10 +13,12 @@
 
 #include "klv.h"
 #include "support/klv_streams.h"
+#include "support/process_reads.h"
 #include "support/recording.h"
 
 using zelta_test::bytesOf;
 using zelta_test::keyOf;
+using zelta_test::ProcessReads;
 using zelta_test::RecordingErrorHandler;
 using zelta_test::RecordingKLVHandler;
 using zelta_test::klv::FileLikeStream;
@@ -93,36 +95,10 @@ void forEachClientBuffer(const std::string& path, Test test) {
   }
 }
 
-// What this process read from files during a read of the whole stream, by
-// the kernel's count: octets and read calls.
-struct ProcessReads {
-  std::uint64_t octets = 0;
-  std::uint64_t calls = 0;
-};
-
-bool processReads(ProcessReads& reads) {
-  std::ifstream io("/proc/self/io");
-  std::string name;
-  std::uint64_t value = 0;
-  bool octets = false;
-  bool calls = false;
-  while (io >> name >> value) {
-    if (name == "rchar:") octets = (reads.octets = value, true);
-    if (name == "syscr:") calls = (reads.calls = value, true);
-  }
-  return octets && calls;
-}
-
 bool readCounted(std::istream& in, KLVHandler& handler, ProcessReads& reads) {
   GenericKLVReader reader;
   reader.setHandler(&handler);
-  ProcessReads before;
-  if (!processReads(before)) return false;
-  reader.read(in);
-  if (!processReads(reads)) return false;
-  reads.octets -= before.octets;
-  reads.calls -= before.calls;
-  return true;
+  return zelta_test::readsOf([&] { reader.read(in); }, reads);
 }
 
 // Takes every value into a buffer of its own and writes nothing down.
