@@ -91,11 +91,12 @@ inline void reportThroughput(benchmark::State& state, std::uint64_t octets, std:
   state.counters["elements"] = benchmark::Counter(static_cast<double>(elements), benchmark::Counter::kIsRate);
 }
 
-// The yardstick: read() of the whole file in 1 MiB pieces, in the same run
-// as the reader that is measured against it.
+// The yardstick: read() of the whole file in pieces of 1 MiB, or of the
+// size given, into one buffer, in the same run as the reader that is
+// measured against it.
 inline void plainReadLoop(benchmark::State& state, const std::string& path, std::uint64_t fileOctets,
-                          std::uint64_t elementOctets) {
-  std::vector<char> buffer(plainBufferOctets);
+                          std::uint64_t elementOctets, std::size_t bufferOctets = plainBufferOctets) {
+  std::vector<char> buffer(bufferOctets);
   std::uint64_t octets = 0;
   for (auto _ : state) {
     const int fd = ::open(path.c_str(), O_RDONLY);

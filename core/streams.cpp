@@ -1,3 +1,6 @@
+#include <cstring>
+
+#include "core/get_area.h"
 #include "klv.h"
 
 namespace util {
@@ -81,6 +84,18 @@ LentInput::LentInput(const ByteVector& bytes) {
 
 LentInput::~LentInput() {
   if (!own_) lender().lent = false;
+}
+
+void getOctets(std::istream& in, std::uint8_t* octets, std::size_t count) {
+  std::streambuf* buffer = in.rdbuf();
+  const auto n = static_cast<std::streamsize>(count);
+  if (in.rdstate() == std::ios_base::goodbit && buffer && zelta::GetArea::available(*buffer) >= n) {
+    std::memcpy(octets, zelta::GetArea::next(*buffer), count);
+    zelta::GetArea::move(*buffer, n);
+    return;
+  }
+  in.read(reinterpret_cast<char*>(octets), n);
+  check(in.gcount() == n, "successful get()");
 }
 
 void requireExhausted(std::istream& in) {

@@ -393,23 +393,25 @@ template <> struct external_size<MXFUID> { static constexpr std::uint32_t value 
 template <> struct external_size<Decimal16> { static constexpr std::uint32_t value = 2; };
 template <> struct external_size<Binary16> { static constexpr std::uint32_t value = 2; };
 
+// Exactly count octets ("successful get()"), from what the stream's buffer
+// holds when it holds them: values are read a few octets at a time.
+void getOctets(std::istream& in, std::uint8_t* octets, std::size_t count);
+
 inline std::uint8_t getOctet(std::istream& in) {
-  std::istream::int_type c = in.get();
-  check(c != std::istream::traits_type::eof(), "successful get()");
-  return static_cast<std::uint8_t>(c);
+  std::uint8_t octet = 0;
+  getOctets(in, &octet, 1);
+  return octet;
 }
 
 inline void putOctet(std::ostream& out, std::uint8_t octet) {
   out.put(static_cast<char>(octet));
 }
 
-// One read of the stream for the whole number, not one per octet.
 template <typename T>
 T getBigEndian(std::istream& in) {
   typedef typename std::make_unsigned<T>::type U;
   std::uint8_t octets[sizeof(T)];
-  in.read(reinterpret_cast<char*>(octets), sizeof(T));
-  check(in.gcount() == static_cast<std::streamsize>(sizeof(T)), "successful get()");
+  getOctets(in, octets, sizeof(T));
   U v = 0;
   for (std::size_t i = 0; i < sizeof(T); ++i) v = static_cast<U>((v << 8) | octets[i]);
   return static_cast<T>(v);
@@ -907,7 +909,6 @@ public:
   const KLVKey& getKey() const { return key_; }
 
 protected:
-
   KLVKey key_;
   std::istream* stream_;
   KLVHandler* handler_;
@@ -929,6 +930,10 @@ public:
   virtual void read(std::istream& stream, std::streampos stop) = 0;
 };
 
+// Reads a file stream (a std::filebuf, whatever its buffer) from the file
+// by position: while read runs, the stream reads through a buffer of the
+// reader's, which is what rdbuf() answers then; when read returns, the
+// stream has its own buffer back and stands where the read stopped.
 class GenericKLVReader : public KLVReader {
 public:
   GenericKLVReader();

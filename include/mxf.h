@@ -780,10 +780,9 @@ class MXFGCSplitterImpl;
 // octets or more need the handler's. Every handler is optional, none is
 // owned. Defects of the stream are reported and skipped.
 //
-// The stream's own buffer decides how much of a value passes through it: a
-// std::ifstream given a small buffer (a few hundred octets, by pubsetbuf
-// before open) reads keys and lengths through it and every value in one
-// read() call straight into the handler's buffer.
+// Whatever buffer a client gives its std::ifstream, the reader reads a large
+// value from the file straight into the handler's buffer; small values come
+// out of the reader's read-ahead.
 class MXFGCSplitter : public DullKLVHandler {
 public:
   MXFGCSplitter();

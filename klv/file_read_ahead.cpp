@@ -70,8 +70,6 @@ FileReadAhead::FileReadAhead(int descriptor, std::streamoff position)
   drop();
 }
 
-void FileReadAhead::drop() { setg(buffer_.get(), buffer_.get(), buffer_.get()); }
-
 FileReadAhead::int_type FileReadAhead::underflow() {
   if (gptr() < egptr()) return traits_type::to_int_type(*gptr());
   ssize_t got;

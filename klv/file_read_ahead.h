@@ -33,7 +33,8 @@ protected:
 private:
   std::streamsize copyOut(char_type* s, std::streamsize n);
   std::streamsize readDirect(char_type* s, std::streamsize held, std::streamsize n);
-  void drop();
+  // Forgets what the read-ahead holds.
+  void drop() { setg(buffer_.get(), buffer_.get(), buffer_.get()); }
 
   int descriptor_;
   std::streamoff next_;      // the file offset of the octet behind the get area

@@ -8,7 +8,7 @@
 #include <istream>
 
 #include "klv.h"
-#include "klv/get_area.h"
+#include "core/get_area.h"
 
 namespace zelta::klv {
 

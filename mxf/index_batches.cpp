@@ -55,7 +55,8 @@ ByteVector takeBytes(const std::ostringstream& out) {
 }  // namespace
 
 void decodeDeltaEntries(const ByteVector& bytes, std::vector<MXFDeltaEntry>& entries) {
-  util::vector_istream in(bytes);
+  util::LentInput lent(bytes);
+  std::istream& in = lent.stream();
   std::uint32_t count = 0;
   std::uint32_t entryLength = 0;
   readHeader(in, count, entryLength);
@@ -73,7 +74,8 @@ void decodeDeltaEntries(const ByteVector& bytes, std::vector<MXFDeltaEntry>& ent
 
 void decodeIndexEntries(const ByteVector& bytes, std::uint8_t sliceCount, std::uint8_t posTableCount,
                         std::vector<MXFIndexEntry>& entries) {
-  util::vector_istream in(bytes);
+  util::LentInput lent(bytes);
+  std::istream& in = lent.stream();
   std::uint32_t count = 0;
   std::uint32_t entryLength = 0;
   readHeader(in, count, entryLength);

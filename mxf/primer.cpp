@@ -5,7 +5,8 @@
 namespace zelta::mxf {
 
 MXFPrimerEntries decodePrimer(const ByteVector& bytes) {
-  util::vector_istream in(bytes);
+  util::LentInput lent(bytes);
+  std::istream& in = lent.stream();
   std::uint32_t count = 0;
   std::uint32_t entrySize = 0;
   internalize(in, count);

@@ -15,7 +15,8 @@ std::uint64_t overallLength(std::uint8_t form, std::uint64_t valueSize) {
 void internalize(const ByteVector& bytes, std::vector<MXFRandomIndexEntry>& entries, std::uint8_t form) {
   check(bytes.size() >= overallLengthOctets && (bytes.size() - overallLengthOctets) % entryOctets == 0,
         "valid external length");
-  util::vector_istream in(bytes);
+  util::LentInput lent(bytes);
+  std::istream& in = lent.stream();
   std::size_t count = (bytes.size() - overallLengthOctets) / entryOctets;
   entries.clear();
   entries.reserve(count);

@@ -39,11 +39,11 @@ void MXFSplitter::Impl::setRunIn(std::uint32_t runIn) {
 // ---------------------------------------------------------------------------
 // Common steps
 
-bool MXFSplitter::Impl::isDelegating() const {
+inline bool MXFSplitter::Impl::isDelegating() const {
   return state_ == headerMetadata || state_ == indexTable || state_ == body;
 }
 
-KLVHandler* MXFSplitter::Impl::delegate() const {
+inline KLVHandler* MXFSplitter::Impl::delegate() const {
   switch (state_) {
     case headerMetadata:
       return metadataHandler_;
@@ -54,12 +54,12 @@ KLVHandler* MXFSplitter::Impl::delegate() const {
   }
 }
 
-std::streamoff MXFSplitter::Impl::position() { return locator_.getPosition(); }
+inline std::streamoff MXFSplitter::Impl::position() { return locator_.getPosition(); }
 
 // By its offset: the conversion state of a position means nothing to a
 // binary stream, and a copy of the whole position right after the upstream
 // wrote it piecewise would stall the processor at every event.
-void MXFSplitter::Impl::storePosition() {
+inline void MXFSplitter::Impl::storePosition() {
   check(upstream_ != nullptr, "has locator");
   locator_.setPosition(std::streampos(std::streamoff(upstream_->getPosition())));
 }

@@ -5,8 +5,18 @@
 namespace zelta_info {
 
 void Reporter::add(const char* severity, const MXFUID& id, const std::string& message) {
+  if (!keeps(severity, id, message)) {
+    ++summary_.suppressed;
+    return;
+  }
   summary_.reports.push_back(Report{severity, id, message});
   std::cerr << severity << ": " << message << "\n";
+}
+
+bool Reporter::keeps(const char* severity, const MXFUID& id, const std::string& message) {
+  if (std::string(severity) == "fatal") return true;
+  if (summary_.reports.size() >= keptReports) return false;
+  return ++kept_[{id, message}] <= reportsPerText;
 }
 
 SectionCounter::SectionCounter(Summary& summary, SectionIndex index, KLVHandler* next)

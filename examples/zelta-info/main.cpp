@@ -48,6 +48,11 @@ const char* const usage =
     "           and writer\n"
     "  --help   print this text\n"
     "\n"
+    "Of the reports of each identifier and text only the first 100 are shown\n"
+    "and kept, and 10000 in all; fatal reports always. The others are counted:\n"
+    "a last line 'suppressed: N further reports' on stderr, and 'suppressed'\n"
+    "in JSON.\n"
+    "\n"
     "Exit status: 0 when the read ended normally, 1 when a fatal error stopped\n"
     "it, 2 on a usage error (no file, unreadable file).\n";
 
@@ -179,6 +184,7 @@ int main(int argc, char** argv) {
   if (!options.copyTo.empty()) return copyFile(in, options.copyTo) ? 0 : 1;
   Summary summary;
   bool ok = readFile(in, summary, options.details);
+  if (summary.suppressed != 0) std::cerr << "suppressed: " << summary.suppressed << " further reports\n";
   if (options.json)
     printJson(std::cout, options.file, !ok, summary, options.details);
   else

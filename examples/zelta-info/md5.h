@@ -1,12 +1,14 @@
-// MD5 (RFC 1321) of a stream of octets, for comparing essence with other
-// tools' checksums.
+// MD5 of a stream of octets, by OpenSSL's libcrypto, for comparing essence
+// with other tools' checksums.
 #ifndef ZELTA_INFO_MD5_H
 #define ZELTA_INFO_MD5_H
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
+
+#include <openssl/evp.h>
 
 namespace zelta_info {
 
@@ -18,12 +20,10 @@ public:
   std::string hexDigest();
 
 private:
-  void block(const std::uint8_t* data);
-
-  std::array<std::uint32_t, 4> state_;
-  std::array<std::uint8_t, 64> pending_{};
-  std::size_t pendingSize_ = 0;
-  std::uint64_t total_ = 0;
+  struct Free {
+    void operator()(EVP_MD_CTX* context) const { EVP_MD_CTX_free(context); }
+  };
+  std::unique_ptr<EVP_MD_CTX, Free> context_;
 };
 
 }  // namespace zelta_info

@@ -248,7 +248,7 @@ void printJson(std::ostream& out, const std::string& file, bool fatal, const Sum
   for (std::size_t i = 0; i < s.reports.size(); ++i)
     out << (i ? ", " : "") << "{\"severity\": \"" << s.reports[i].severity << "\", \"identifier\": \""
         << identifier(s.reports[i].identifier) << "\", \"message\": " << jsonString(s.reports[i].message) << "}";
-  out << "]}\n";
+  out << "], \"suppressed\": " << s.suppressed << "}\n";
 }
 
 }  // namespace zelta_info

@@ -3,7 +3,9 @@
 #define ZELTA_INFO_SUMMARY_H
 
 #include <cstdint>
+#include <map>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "essence.h"
@@ -56,11 +58,19 @@ struct Summary {
   Essence essence;
   Model model;
   std::vector<Report> reports;
+  std::uint64_t suppressed = 0;  // reports neither kept nor echoed
 };
 
-// Keeps the reports and echoes them to stderr.
+// Keeps the reports and echoes them to stderr. A damaged file can bring a
+// report for every few octets, so memory and output must not follow their
+// number: of each identifier and text only the first reportsPerText are
+// kept, and no more than keptReports in all; the others are counted. Fatal
+// reports, one to a read, are always kept.
 class Reporter : public ErrorHandler {
 public:
+  static constexpr std::uint32_t reportsPerText = 100;
+  static constexpr std::size_t keptReports = 10000;
+
   explicit Reporter(Summary& summary) : summary_(summary) {}
   void setLocator(Locator*) override {}
   void start() override {}
@@ -71,7 +81,9 @@ public:
 
 private:
   void add(const char* severity, const MXFUID& id, const std::string& message);
+  bool keeps(const char* severity, const MXFUID& id, const std::string& message);
   Summary& summary_;
+  std::map<std::pair<MXFUID, std::string>, std::uint32_t> kept_;
 };
 
 // Counts the top-level elements and octets of one section of each partition,

@@ -113,6 +113,31 @@ MXFPartitionPack packWithCounts(std::uint64_t headerByteCount, std::uint64_t ind
   return pack;
 }
 
+namespace {
+
+ByteVector endlessSet(const KLVKey& key, std::uint64_t zeroOctets) {
+  const ByteVector longest{0x88, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF};
+  ByteVector bytes(key.data(), key.data() + KLVKey::size());
+  bytes.insert(bytes.end(), longest.begin(), longest.end());
+  bytes.resize(bytes.size() + zeroOctets, 0);
+  return bytes;
+}
+
+}  // namespace
+
+ByteVector metadataFlood(std::uint64_t zeroOctets) {
+  const ByteVector primer = element(MXFPrimerPackKey, ByteVector{0, 0, 0, 0, 0, 0, 0, 18});
+  const ByteVector set = endlessSet(metadataSetKey(), zeroOctets);
+  return concat({partitionPack(2, 4, packWithCounts(primer.size() + set.size(), 0)), primer, set});
+}
+
+ByteVector indexFlood(std::uint64_t zeroOctets) {
+  const ByteVector segment = endlessSet(indexSegmentKey(), zeroOctets);
+  MXFPartitionPack pack = packWithCounts(0, segment.size());
+  pack.indexSID = 1;
+  return concat({partitionPack(2, 4, pack), segment});
+}
+
 ByteVector randomIndexValue(const std::vector<std::pair<std::uint32_t, std::uint64_t>>& entries) {
   ByteVector out;
   for (const auto& entry : entries) {

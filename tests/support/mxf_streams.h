@@ -42,6 +42,13 @@ MXFPartitionPack packWithCounts(std::uint64_t headerByteCount, std::uint64_t ind
 ByteVector randomIndexValue(const std::vector<std::pair<std::uint32_t, std::uint64_t>>& entries);
 ByteVector randomIndexPack(const std::vector<std::pair<std::uint32_t, std::uint64_t>>& entries);
 
+// A header partition whose header metadata, after an empty primer, or whose
+// index is one local set with a length far beyond the end of the file,
+// followed by zero octets: a tag of 00.00, which no primer holds, and a
+// length of 0 every four octets, to the end of the file.
+ByteVector metadataFlood(std::uint64_t zeroOctets);
+ByteVector indexFlood(std::uint64_t zeroOctets);
+
 // Lines of events in the order they came from every journaling handler,
 // with the position each handler's locator gave at that event.
 struct Journal {

@@ -1,10 +1,10 @@
 // The octets that a stream buffer already holds ahead of its position.
-#ifndef ZELTA_KLV_GET_AREA_H
-#define ZELTA_KLV_GET_AREA_H
+#ifndef ZELTA_CORE_GET_AREA_H
+#define ZELTA_CORE_GET_AREA_H
 
 #include <streambuf>
 
-namespace zelta::klv {
+namespace zelta {
 
 // Reads and passes over what a stream buffer holds without calling into it:
 // the stream's own buffer serves small octet runs without a virtual call,
@@ -31,6 +31,6 @@ public:
   }
 };
 
-}  // namespace zelta::klv
+}  // namespace zelta
 
 #endif
