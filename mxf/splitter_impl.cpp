@@ -286,6 +286,10 @@ void MXFSplitter::Impl::endRandomIndexPack(const KLVKey& key) {
 
 void MXFSplitter::Impl::value(const std::uint8_t* data, std::streamsize size) {
   storePosition();
+  if (state_ == body) {
+    essenceHandler_->value(data, size);
+    return;
+  }
   if (state_ == inPartitionPack || state_ == inRandomIndex) {
     buffer_.insert(buffer_.end(), data, data + size);
     return;
@@ -297,13 +301,24 @@ void MXFSplitter::Impl::value(const std::uint8_t* data, std::streamsize size) {
 // ---------------------------------------------------------------------------
 // Elements handed to the delegates
 
+// Most elements of a file are individual items of a body whose delegate has
+// started; for them the common steps come to passing the element on.
 bool MXFSplitter::Impl::startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
+  if (state_ == body && delegateStarted_) {
+    storePosition();
+    return essenceHandler_->startIndividualItem(key, length, buffer);
+  }
   // The one fill item behind a pack belongs to the pack.
   if (state_ == afterPartitionPack && key == KLVFillItemKey) return false;
   return enterElement("unexpected individual item", key)->startIndividualItem(key, length, buffer);
 }
 
 void MXFSplitter::Impl::endIndividualItem(const KLVKey& key) {
+  if (state_ == body) {
+    storePosition();
+    essenceHandler_->endIndividualItem(key);
+    return;
+  }
   if (state_ == afterPartitionPack) {
     storePosition();
     check(key == KLVFillItemKey, "expected individual item");
