@@ -29,7 +29,7 @@ MXFGCEssenceHandler* MXFGCSplitter::getEssenceHandler() const {
   return impl_->essenceHandler;
 }
 
-void MXFGCSplitter::setErrorHandler(ErrorHandler* errorHandler) { impl_->errorHandler = errorHandler; }
+void MXFGCSplitter::setErrorHandler(ErrorHandler* errorHandler) { impl_->reports.setHandler(errorHandler); }
 
 void MXFGCSplitter::startStream(bool hasAccurateLengths) { impl_->startStream(hasAccurateLengths); }
 void MXFGCSplitter::endStream(bool) { impl_->endStream(); }

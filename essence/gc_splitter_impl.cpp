@@ -2,8 +2,6 @@
 
 #include <algorithm>
 #include <cstring>
-#include <iomanip>
-#include <sstream>
 
 namespace {
 
@@ -13,12 +11,6 @@ constexpr std::uint64_t largestOwnBufferElement = 0x1000000;
 // Lengths of system items come from the file: a damaged one must not make the
 // splitter allocate what the stream never holds.
 constexpr std::uint64_t largestReservation = 65536;
-
-std::string hexMessage(const char* text, std::uint64_t value, int width) {
-  std::ostringstream message;
-  message << text << " - 0x" << std::uppercase << std::hex << std::setfill('0') << std::setw(width) << value;
-  return message.str();
-}
 
 }  // namespace
 
@@ -51,7 +43,7 @@ void MXFGCSplitterImpl::endStream() {
 
 void MXFGCSplitterImpl::setLengthForm(std::uint8_t form) {
   if (form != 0x83 && form != 0x87)
-    report(&ErrorHandler::warning, nonStandardLengthFormId, hexMessage("non-standard BER length form", form, 2));
+    reports.warning(nonStandardLengthFormId, zelta::detailed("non-standard BER length form", zelta::octetText(form)));
   form_ = form;
 }
 
@@ -146,8 +138,8 @@ bool MXFGCSplitterImpl::offerEssence(const KLVKey& key, std::uint64_t length) {
     return true;
   }
   if (length >= largestOwnBufferElement) {
-    report(&ErrorHandler::error, unsupportedGCElementLengthId,
-           hexMessage("unsupported GC essence element length", length, 0));
+    reports.error(unsupportedGCElementLengthId,
+                  zelta::detailed("unsupported GC essence element length", zelta::hexText(length, 0)));
     deliver(key, nullptr, length);
     return false;
   }
@@ -293,13 +285,6 @@ bool MXFGCSplitterImpl::invalidElement(const KLVKey& key) {
   return false;
 }
 
-void MXFGCSplitterImpl::report(void (ErrorHandler::*level)(const MXFUID&, const std::string&),
-                               const MXFUID& identifier, const std::string& message) {
-  if (errorHandler) (errorHandler->*level)(identifier, message);
-}
-
 void MXFGCSplitterImpl::reportKey(const MXFUID& identifier, const char* text, const KLVKey& key) {
-  std::ostringstream message;
-  message << text << " - " << key;
-  report(&ErrorHandler::error, identifier, message.str());
+  reports.error(identifier, zelta::detailed(text, zelta::keyText(key)));
 }

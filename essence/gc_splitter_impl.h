@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <string>
 
+#include "core/reports.h"
 #include "essence/gc_own_buffer.h"
 #include "mxf.h"
 
@@ -17,7 +18,7 @@ public:
   MXFGCStructureHandler* structureHandler = nullptr;
   MXFGCSystemHandler* systemHandler = nullptr;
   MXFGCEssenceHandler* essenceHandler = nullptr;
-  ErrorHandler* errorHandler = nullptr;
+  zelta::Reports reports;
 
   void startStream(bool hasAccurateLengths);
   void endStream();
@@ -55,8 +56,6 @@ private:
   // In the system item: whether the end of an element is to be delivered.
   bool endsSystemElement(const char* expected) const;
 
-  void report(void (ErrorHandler::*level)(const MXFUID&, const std::string&), const MXFUID& identifier,
-              const std::string& message);
   void reportKey(const MXFUID& identifier, const char* text, const KLVKey& key);
 
   const MXFGCSplitter& owner_;

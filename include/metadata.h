@@ -412,7 +412,6 @@ public:
 
 private:
   bool connect(const std::shared_ptr<dangling_ref_base>& reference, const MXFUID& target, bool backward);
-  void report(bool isError, const MXFUID& identifier, const std::string& message);
 
   MXFMetadataModel roots_;
   MXFPendingReferences pending_;

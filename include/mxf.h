@@ -265,10 +265,8 @@ protected:
 
   State getState() const { return state_; }
   void setState(State state) { state_ = state; }
+  // Null when none is set: reports then vanish.
   ErrorHandler* getErrorHandler() const { return errorHandler_; }
-  // Reports vanish when no error handler is set.
-  void reportWarning(const MXFUID& identifier, const std::string& message);
-  void reportError(const MXFUID& identifier, const std::string& message);
 
 private:
   State state_ = idle;

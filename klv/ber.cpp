@@ -4,7 +4,7 @@
 
 #include <cstring>
 
-#include "klv/messages.h"
+#include "core/reports.h"
 #include "klv/stream_input.h"
 
 namespace zelta::klv {
@@ -21,7 +21,7 @@ void noteForm(std::uint8_t form, std::uint8_t& currentForm, KLVHandler& handler)
 }
 
 [[noreturn]] void invalidLongForm(std::uint8_t first) {
-  throw KLVElement::parse_error(berLengthErrorId, withOctet("invalid BER long form", first));
+  throw KLVElement::parse_error(berLengthErrorId, detailed("invalid BER long form", octetText(first)));
 }
 
 // The longest length lies in the stream's buffer: read in place, with one

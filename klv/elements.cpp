@@ -2,18 +2,19 @@
 
 #include <cstring>
 
+#include "core/reports.h"
 #include "klv/ber.h"
-#include "klv/messages.h"
 #include "klv/stream_input.h"
 
+using zelta::detailed;
+using zelta::keyText;
+using zelta::octetText;
 using zelta::klv::readBERLength;
 using zelta::klv::readBigEndian;
 using zelta::klv::readKey;
 using zelta::klv::skipValue;
 using zelta::klv::smptePrefix;
 using zelta::klv::transferValue;
-using zelta::klv::withKey;
-using zelta::klv::withOctet;
 
 namespace {
 
@@ -48,7 +49,7 @@ struct Kind {
 template <typename Make>
 decltype(auto) withKind(const KLVKey& key, Make&& make) {
   if (std::memcmp(key.data(), smptePrefix, sizeof smptePrefix) != 0)
-    throw KLVElement::parse_error(klvCodingErrorId, withKey("invalid SMPTE key", key));
+    throw KLVElement::parse_error(klvCodingErrorId, detailed("invalid SMPTE key", keyText(key)));
   switch (key[4]) {
     case 1:
       return make(Kind<KLVIndividualItem>());
@@ -69,7 +70,7 @@ decltype(auto) withKind(const KLVKey& key, Make&& make) {
     case 4:
       return make(Kind<KLVLabel>());
   }
-  throw KLVElement::parse_error(klvCodingErrorId, withKey("unimplemented SMPTE KLV coding", key));
+  throw KLVElement::parse_error(klvCodingErrorId, detailed("unimplemented SMPTE KLV coding", keyText(key)));
 }
 
 }  // namespace
@@ -112,7 +113,8 @@ void KLVFixedLengthPack::parse() {
 
 bool KLVWrapper::isWrapper() const {
   bool wrapper = false;
-  if (!KLVWrapperCoding(key_, wrapper)) throw parse_error(klvCodingErrorId, withOctet("invalid wrapper type", key_[5]));
+  if (!KLVWrapperCoding(key_, wrapper))
+    throw parse_error(klvCodingErrorId, detailed("invalid wrapper type", octetText(key_[5])));
   return wrapper;
 }
 
@@ -145,7 +147,7 @@ void KLVUniversalSet::parse() {
 
 void KLVLocalSet::coding(KLVTagType& tagType, KLVLengthType& lengthType) const {
   if (!KLVLocalSetCoding(key_, tagType, lengthType))
-    throw parse_error(klvCodingErrorId, withOctet("invalid local set type", key_[5]));
+    throw parse_error(klvCodingErrorId, detailed("invalid local set type", octetText(key_[5])));
 }
 
 KLVTagType KLVLocalSet::getTagType() const {
@@ -188,7 +190,7 @@ void KLVLocalSet::parse() {
 KLVLengthType KLVVariableLengthPack::getLengthType() const {
   KLVLengthType lengthType = 0;
   if (!KLVVariableLengthPackCoding(key_, lengthType))
-    throw parse_error(klvCodingErrorId, withOctet("invalid variable length pack type", key_[5]));
+    throw parse_error(klvCodingErrorId, detailed("invalid variable length pack type", octetText(key_[5])));
   return lengthType;
 }
 

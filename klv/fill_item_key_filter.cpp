@@ -1,5 +1,5 @@
+#include "core/reports.h"
 #include "klv.h"
-#include "klv/messages.h"
 
 KLVFillItemKeyFilter::KLVFillItemKeyFilter(KLVHandler* handler, std::uint8_t fillItemKeyVersion,
                                            ErrorHandler* errorHandler)
@@ -28,6 +28,6 @@ void KLVFillItemKeyFilter::inspect(const KLVKey& key) {
   const bool expected = version_ != 0 ? version == version_ : (version == 1 || version == 2);
   if (expected) return;
   warned_ = true;
-  if (errorHandler_)
-    errorHandler_->warning(fillItemKeyVersionId, zelta::klv::withOctet("unexpected fill item key version", version));
+  zelta::Reports(errorHandler_)
+      .warning(fillItemKeyVersionId, zelta::detailed("unexpected fill item key version", zelta::octetText(version)));
 }

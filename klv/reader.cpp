@@ -1,5 +1,6 @@
 #include <memory>
 
+#include "core/reports.h"
 #include "klv.h"
 #include "klv/elements.h"
 #include "klv/file_read_ahead.h"
@@ -50,7 +51,7 @@ void endAborted(KLVHandler* handler, ErrorHandler* errorHandler) {
 [[noreturn]] void failBadStream(ErrorHandler* errorHandler) {
   const KLVElement::parse_error failure(streamFailureId, "input stream is not good()");
   try {
-    if (errorHandler) errorHandler->fatalError(failure.getIdentifier(), failure.what());
+    zelta::Reports(errorHandler).fatalError(failure.getIdentifier(), failure.what());
   } catch (...) {
     endAborted(nullptr, errorHandler);
     throw;
@@ -97,7 +98,7 @@ void GenericKLVReader::read(std::istream& stream, std::streampos stop) {
       position.filter->startStream(true);
       readElements(stream, stop, *position.filter, *position.locator, seekable);
     } catch (const KLVElement::parse_error& failure) {
-      if (errorHandler_) errorHandler_->fatalError(failure.getIdentifier(), failure.what());
+      zelta::Reports(errorHandler_).fatalError(failure.getIdentifier(), failure.what());
       throw;
     }
   } catch (...) {

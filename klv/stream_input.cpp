@@ -22,7 +22,8 @@ std::streamsize buffered(std::istream& stream) {
 // seekg() would after lifting the end-of-file bit.
 void seekForward(std::istream& stream, std::streamoff octets) {
   if (stream.eof()) stream.clear(stream.rdstate() & ~std::ios_base::eofbit);
-  if (stream.fail() || stream.rdbuf()->pubseekoff(octets, std::ios_base::cur, std::ios_base::in) == std::streampos(-1)) {
+  if (stream.fail() ||
+      stream.rdbuf()->pubseekoff(octets, std::ios_base::cur, std::ios_base::in) == std::streampos(-1)) {
     stream.setstate(std::ios_base::failbit);
     throw KLVElement::parse_error(streamFailureId, "unsuccessful seekg()");
   }

@@ -7,8 +7,8 @@
 #include <cstring>
 #include <istream>
 
-#include "klv.h"
 #include "core/get_area.h"
+#include "klv.h"
 
 namespace zelta::klv {
 

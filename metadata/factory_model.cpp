@@ -1,5 +1,6 @@
 #include <variant>
 
+#include "core/reports.h"
 #include "metadata.h"
 #include "metadata/model_support.h"
 
@@ -69,9 +70,10 @@ bool MXFMetadataModelFactory::isReferenceDarkProperty(const KLVKey&, const KLVKe
 
 void MXFMetadataModelFactory::fireReferenceDarkPropertyInternalizeError(
     const KLVKey& key, const util::assertion_failure& exception) const {
-  if (const std::shared_ptr<ErrorHandler> errors = errorHandler_.lock())
-    errors->error(invalidPropertyValueId,
-                  "invalid reference dark property (" + zelta::keyText(key) + ") value - " + exception.what());
+  const std::shared_ptr<ErrorHandler> errors = errorHandler_.lock();
+  zelta::Reports(errors.get())
+      .error(invalidPropertyValueId,
+             zelta::detailed("invalid reference dark property (" + zelta::keyText(key) + ") value", exception.what()));
 }
 
 MXFMetadataFactory& MXFMetadataModelFactory::byType(const std::type_info& type) {

@@ -1,5 +1,6 @@
 #include <algorithm>
 
+#include "core/reports.h"
 #include "metadata.h"
 #include "metadata/model_support.h"
 
@@ -114,12 +115,15 @@ void MetadataRootFactory::codeProperties(const std::shared_ptr<const MetadataRoo
 
 bool MetadataRootFactory::allowBERLengths() const { return false; }
 
+// The handler is kept weakly: it stays alive for the report, or is gone.
 void MetadataRootFactory::firePropertyRequiredError(const std::string& name) const {
-  if (const std::shared_ptr<ErrorHandler> errors = getErrorHandler()) errors->error(missingPropertyId, "missing " + name);
+  const std::shared_ptr<ErrorHandler> errors = getErrorHandler();
+  zelta::Reports(errors.get()).error(missingPropertyId, "missing " + name);
 }
 
 void MetadataRootFactory::firePropertyInternalizeError(const std::string& name,
                                                        const util::assertion_failure& exception) const {
-  if (const std::shared_ptr<ErrorHandler> errors = getErrorHandler())
-    errors->error(invalidPropertyValueId, "invalid " + name + " value - " + exception.what());
+  const std::shared_ptr<ErrorHandler> errors = getErrorHandler();
+  zelta::Reports(errors.get())
+      .error(invalidPropertyValueId, zelta::detailed("invalid " + name + " value", exception.what()));
 }

@@ -1,10 +1,12 @@
 #include <algorithm>
 
+#include "core/reports.h"
 #include "metadata.h"
 #include "metadata/model_support.h"
 
+using zelta::detailed;
 using zelta::hasLiveOwner;
-using zelta::instanceUIDText;
+using zelta::identifierText;
 
 MXFMetadataModelHandler::~MXFMetadataModelHandler() = default;
 
@@ -24,7 +26,8 @@ void MXFMetadataModelParser::primer(const MXFPrimerEntries&) {}
 // An unknown set is not kept in any form: only properties can be dark.
 bool MXFMetadataModelParser::acceptSet(const KLVKey& key) {
   if (factory_->canParse(key)) return true;
-  report(false, unrecognizedMetadataId, "unrecognized (dark) metadata - " + zelta::keyText(key));
+  zelta::Reports(errorHandler_)
+      .warning(unrecognizedMetadataId, detailed("unrecognized (dark) metadata", zelta::keyText(key)));
   return false;
 }
 
@@ -34,7 +37,8 @@ void MXFMetadataModelParser::primedSet(const MXFPrimedSet& set) {
   const std::shared_ptr<MetadataRoot>& object = parsed.object;
   const MXFUID& identifier = object->getInstanceUID();
   if (!instances_.emplace(identifier, object).second) {
-    report(true, duplicateInstanceUIDId, "duplicate MetadataRoot.instanceUID - " + instanceUIDText(identifier));
+    zelta::Reports(errorHandler_)
+        .error(duplicateInstanceUIDId, detailed("duplicate MetadataRoot.instanceUID", identifierText(identifier)));
     roots_.push_back(object);
   } else {
     const auto waiting = pending_.equal_range(identifier);
@@ -55,17 +59,19 @@ void MXFMetadataModelParser::setErrorHandler(ErrorHandler* errorHandler) { error
 // points back still connects.
 bool MXFMetadataModelParser::connect(const std::shared_ptr<dangling_ref_base>& reference, const MXFUID& target,
                                      bool backward) {
+  const zelta::Reports reports(errorHandler_);
   const std::shared_ptr<MetadataRoot>& object = instances_.at(target);
   if (reference->isStrong() && hasLiveOwner(object)) {
-    report(true, objectAlreadyOwnedId, "referenced object is already owned - " + instanceUIDText(target));
+    reports.error(objectAlreadyOwnedId, detailed("referenced object is already owned", identifierText(target)));
     return false;
   }
   if (backward && reference->isStrong())
-    report(false, backwardStrongReferenceId, "backward strong reference - " + instanceUIDText(target));
+    reports.warning(backwardStrongReferenceId, detailed("backward strong reference", identifierText(target)));
   try {
     reference->resolve(object);
   } catch (const util::assertion_failure& exception) {
-    report(true, invalidReferenceId, "invalid reference - " + instanceUIDText(target) + " - " + exception.what());
+    reports.error(invalidReferenceId,
+                  detailed(detailed("invalid reference", identifierText(target)), exception.what()));
     return false;
   }
   return true;
@@ -74,21 +80,16 @@ bool MXFMetadataModelParser::connect(const std::shared_ptr<dangling_ref_base>& r
 // The model goes out with what there is: the root first, then whatever
 // nothing owns.
 void MXFMetadataModelParser::end() {
+  const zelta::Reports reports(errorHandler_);
   if (!pending_.empty())
-    report(false, danglingReferencesId,
-           "model has dangling references - " + instanceUIDText(pending_.begin()->first));
-  if (!roots_.empty() && hasLiveOwner(roots_.front())) report(true, firstObjectNotRootId, "first object is not model root");
+    reports.warning(danglingReferencesId,
+                    detailed("model has dangling references", identifierText(pending_.begin()->first)));
+  if (!roots_.empty() && hasLiveOwner(roots_.front()))
+    reports.error(firstObjectNotRootId, "first object is not model root");
   roots_.erase(std::remove_if(roots_.begin(), roots_.end(), hasLiveOwner), roots_.end());
   if (roots_.size() >= 2)
-    report(false, unreferencedObjectsId, "unreferenced objects - " + instanceUIDText(roots_[1]->getInstanceUID()));
+    reports.warning(unreferencedObjectsId,
+                    detailed("unreferenced objects", identifierText(roots_[1]->getInstanceUID())));
   if (!roots_.empty()) handler_->model(roots_);
   handler_->end();
-}
-
-void MXFMetadataModelParser::report(bool isError, const MXFUID& identifier, const std::string& message) {
-  if (!errorHandler_) return;
-  if (isError)
-    errorHandler_->error(identifier, message);
-  else
-    errorHandler_->warning(identifier, message);
 }

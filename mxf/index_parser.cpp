@@ -1,3 +1,4 @@
+#include "core/reports.h"
 #include "mxf/index_batches.h"
 #include "mxf/index_properties.h"
 
@@ -10,22 +11,21 @@ namespace {
 // what is missing or cannot be read; the field keeps what was read.
 class SegmentReader {
 public:
-  SegmentReader(const MXFPrimedSet& set, ErrorHandler* errors) : set_(set), errors_(errors) {}
+  SegmentReader(const MXFPrimedSet& set, ErrorHandler* errors) : set_(set), reports_(errors) {}
 
   template <typename Decode>
   void read(IndexProperty property, Decode decode) {
     const zelta::mxf::IndexPropertyInfo& info = indexProperty(property);
     const auto found = set_.properties.find(info.key);
     if (found == set_.properties.end()) {
-      if (info.required && errors_) errors_->error(missingIndexPropertyId, std::string("missing ") + info.name);
+      if (info.required) reports_.error(missingIndexPropertyId, std::string("missing ") + info.name);
       return;
     }
     try {
       decode(found->second);
     } catch (const util::assertion_failure& failure) {
-      if (errors_)
-        errors_->error(invalidIndexPropertyId,
-                       std::string("invalid ") + info.name + " value - " + failure.what());
+      reports_.error(invalidIndexPropertyId,
+                     zelta::detailed(std::string("invalid ") + info.name + " value", failure.what()));
     }
   }
 
@@ -36,7 +36,7 @@ public:
 
 private:
   const MXFPrimedSet& set_;
-  ErrorHandler* errors_;
+  zelta::Reports reports_;
 };
 
 void readSegment(const MXFPrimedSet& set, ErrorHandler* errors, MXFIndexTableSegment& segment) {
@@ -97,14 +97,15 @@ void MXFIndexParser::primedSet(const MXFPrimedSet& set) {
 }
 
 void MXFIndexParser::reportInconsistencies(const MXFIndexTableSegment& segment) {
+  const zelta::Reports reports(getErrorHandler());
   const bool constantSize = segment.editUnitByteCount != 0;
   const bool hasEntries = !segment.indexEntryArray.empty();
   if (segment.indexDuration == 0 && !constantSize)
-    reportWarning(inconsistentIndexSegmentId, "inconsistent indexDuration and editUnitByteCount");
+    reports.warning(inconsistentIndexSegmentId, "inconsistent indexDuration and editUnitByteCount");
   if (hasEntries && static_cast<std::int64_t>(segment.indexEntryArray.size()) != segment.indexDuration)
-    reportWarning(inconsistentIndexSegmentId, "inconsistent indexDuration and indexEntryArray");
+    reports.warning(inconsistentIndexSegmentId, "inconsistent indexDuration and indexEntryArray");
   if (constantSize && segment.indexStartPosition != 0)
-    reportWarning(inconsistentIndexSegmentId, "inconsistent editUnitByteCount and indexStartPosition");
+    reports.warning(inconsistentIndexSegmentId, "inconsistent editUnitByteCount and indexStartPosition");
   if (constantSize == hasEntries)
-    reportWarning(inconsistentIndexSegmentId, "inconsistent editUnitByteCount and indexEntryArray");
+    reports.warning(inconsistentIndexSegmentId, "inconsistent editUnitByteCount and indexEntryArray");
 }

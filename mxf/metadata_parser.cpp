@@ -1,6 +1,6 @@
 #include <algorithm>
 
-#include "klv/messages.h"
+#include "core/reports.h"
 #include "mxf.h"
 #include "mxf/primer.h"
 
@@ -42,20 +42,23 @@ bool MXFMetadataParser::startLocalSet(const KLVKey& key, std::uint64_t length, K
                                       KLVLengthType lengthType) {
   if (formChanged_ && lastForm_ != standardForm) {
     formChanged_ = false;
-    reportWarning(nonStandardCodingId, zelta::klv::withOctet("non-standard BER length form", lastForm_));
+    zelta::Reports(getErrorHandler())
+        .warning(nonStandardCodingId, zelta::detailed("non-standard BER length form", zelta::octetText(lastForm_)));
   }
   largestItem_ = 0;
   lengthType_ = lengthType;
   if (lengthType != KLVLengthTypeBER && lengthType != KLVLengthType2)
-    reportWarning(nonStandardCodingId,
-                  std::string("non-standard local item length type - ") + KLVLengthTypeLabel(lengthType));
+    zelta::Reports(getErrorHandler())
+        .warning(nonStandardCodingId,
+                 zelta::detailed("non-standard local item length type", KLVLengthTypeLabel(lengthType)));
   return MXFPrimedSetParser::startLocalSet(key, length, tagType, lengthType);
 }
 
 void MXFMetadataParser::endLocalSet(const KLVKey& key) {
   if (lengthType_ == KLVLengthTypeBER && largestItem_ < twoOctetLengthLimit)
-    reportWarning(nonStandardCodingId,
-                  std::string("non-standard local item length type - ") + KLVLengthTypeLabel(KLVLengthTypeBER));
+    zelta::Reports(getErrorHandler())
+        .warning(nonStandardCodingId,
+                 zelta::detailed("non-standard local item length type", KLVLengthTypeLabel(KLVLengthTypeBER)));
   MXFPrimedSetParser::endLocalSet(key);
 }
 
@@ -78,7 +81,8 @@ void MXFMetadataParser::endFixedLengthPack(const KLVKey& key) {
   try {
     entries = zelta::mxf::decodePrimer(primerBytes_);
   } catch (const util::assertion_failure& failure) {
-    reportError(invalidPrimerValueId, std::string("invalid primer value - ") + failure.what());
+    zelta::Reports(getErrorHandler())
+        .error(invalidPrimerValueId, zelta::detailed("invalid primer value", failure.what()));
     entries = getMXFStandardPrimer();
   }
   keys_ = zelta::mxf::verifyPrimer(entries, getErrorHandler());

@@ -1,19 +1,12 @@
 #include <algorithm>
 
+#include "core/reports.h"
 #include "mxf.h"
 #include "mxf/primer.h"
 
 MXFPrimedSetParser::MXFPrimedSetParser() : property_(set_.properties.end()) {}
 
 void MXFPrimedSetParser::setErrorHandler(ErrorHandler* errorHandler) { errorHandler_ = errorHandler; }
-
-void MXFPrimedSetParser::reportWarning(const MXFUID& identifier, const std::string& message) {
-  if (errorHandler_) errorHandler_->warning(identifier, message);
-}
-
-void MXFPrimedSetParser::reportError(const MXFUID& identifier, const std::string& message) {
-  if (errorHandler_) errorHandler_->error(identifier, message);
-}
 
 bool MXFPrimedSetParser::startLocalSet(const KLVKey& key, std::uint64_t, KLVTagType tagType, KLVLengthType) {
   wanted_ = false;
@@ -41,12 +34,14 @@ bool MXFPrimedSetParser::startLocalItem(std::uint32_t tag, std::uint64_t length,
   const MXFTagToKeyMap& primer = getPrimer();
   const auto known = primer.find(static_cast<std::uint16_t>(tag));
   if (known == primer.end()) {
-    reportError(tagMissingInPrimerId, "tag missing in primer - " + zelta::mxf::tagText(tag));
+    zelta::Reports(errorHandler_)
+        .error(tagMissingInPrimerId, zelta::detailed("tag missing in primer", zelta::tagText(tag)));
     return false;
   }
   const auto inserted = set_.properties.emplace(known->second, ByteVector());
   if (!inserted.second) {
-    reportError(repeatedPropertyId, "unexpected repeated property - " + zelta::mxf::tagText(tag));
+    zelta::Reports(errorHandler_)
+        .error(repeatedPropertyId, zelta::detailed("unexpected repeated property", zelta::tagText(tag)));
     return false;
   }
   property_ = inserted.first;

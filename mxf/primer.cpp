@@ -1,6 +1,6 @@
 #include "mxf/primer.h"
 
-#include <iomanip>
+#include "core/reports.h"
 
 namespace zelta::mxf {
 
@@ -42,44 +42,38 @@ ByteVector encodePrimer(const MXFPrimerEntries& entries) {
 
 namespace {
 
-void compareWithStandard(const MXFPrimerEntry& entry, ErrorHandler& errors) {
+void compareWithStandard(const MXFPrimerEntry& entry, const zelta::Reports& errors) {
   const MXFTagToKeyMap& standardKeys = getMXFStandardPrimerKeys();
   const auto byTag = standardKeys.find(entry.tag);
   if (byTag != standardKeys.end() && byTag->second != entry.key)
-    errors.error(nonStandardPrimerKeyId, "non-standard primer key - " + entryText(entry));
+    errors.error(nonStandardPrimerKeyId, zelta::detailed("non-standard primer key", entryText(entry)));
   const MXFKeyToTagMap& standardTags = getMXFStandardPrimerTags();
   const auto byKey = standardTags.find(entry.key);
   if (byKey != standardTags.end() && byKey->second != entry.tag)
-    errors.warning(nonStandardPrimerTagId, "non-standard primer tag - " + entryText(entry));
+    errors.warning(nonStandardPrimerTagId, zelta::detailed("non-standard primer tag", entryText(entry)));
 }
 
 }  // namespace
 
-MXFTagToKeyMap verifyPrimer(const MXFPrimerEntries& entries, ErrorHandler* errors) {
+MXFTagToKeyMap verifyPrimer(const MXFPrimerEntries& entries, ErrorHandler* errorHandler) {
+  const zelta::Reports errors(errorHandler);
   MXFTagToKeyMap keys;
   MXFKeyToTagMap tags;
   for (const MXFPrimerEntry& entry : entries) {
-    if (errors) compareWithStandard(entry, *errors);
+    if (errorHandler) compareWithStandard(entry, errors);
     const auto byTag = keys.emplace(entry.tag, entry.key);
-    if (!byTag.second && byTag.first->second != entry.key && errors)
-      errors->error(inconsistentPrimerKeyId, "inconsistent primer key - " + entryText(entry));
+    if (!byTag.second && byTag.first->second != entry.key)
+      errors.error(inconsistentPrimerKeyId, zelta::detailed("inconsistent primer key", entryText(entry)));
     const auto byKey = tags.emplace(entry.key, entry.tag);
-    if (!byKey.second && byKey.first->second != entry.tag && errors)
-      errors->warning(inconsistentPrimerTagId, "inconsistent primer tag - " + entryText(entry));
+    if (!byKey.second && byKey.first->second != entry.tag)
+      errors.warning(inconsistentPrimerTagId, zelta::detailed("inconsistent primer tag", entryText(entry)));
   }
   return keys;
 }
 
-std::string tagText(std::uint32_t tag) {
-  loomlib::ostringstream_classic out;
-  out << std::uppercase << std::hex << std::setfill('0') << std::setw(2) << ((tag >> 8) & 0xFF) << '.' << std::setw(2)
-      << (tag & 0xFF);
-  return out.str();
-}
-
 std::string entryText(const MXFPrimerEntry& entry) {
   loomlib::ostringstream_classic out;
-  out << "{ " << tagText(entry.tag) << ", " << entry.key << " }";
+  out << "{ " << zelta::tagText(entry.tag) << ", " << entry.key << " }";
   return out.str();
 }
 

@@ -27,8 +27,6 @@ ByteVector encodePrimer(const MXFPrimerEntries& entries);
 // earlier entry. A tag keeps its first key; a key may have several tags.
 MXFTagToKeyMap verifyPrimer(const MXFPrimerEntries& entries, ErrorHandler* errors);
 
-// "3C.0A"
-std::string tagText(std::uint32_t tag);
 // "{ 3C.0A, 06.0E.2B.34.01.01.01.01.01.01.15.02.00.00.00.00 }"
 std::string entryText(const MXFPrimerEntry& entry);
 

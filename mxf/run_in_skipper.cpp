@@ -2,6 +2,7 @@
 #include <stdexcept>
 #include <string>
 
+#include "core/reports.h"
 #include "klv/stream_input.h"
 #include "mxf.h"
 
@@ -22,7 +23,7 @@ void MXFRunInSkipper::setErrorHandler(ErrorHandler* errorHandler) { errorHandler
 
 std::uint32_t MXFRunInSkipper::skip(std::istream& stream, std::uint32_t maximum) {
   const auto fatal = [this](const MXFUID& identifier, const char* text) {
-    if (errorHandler_) errorHandler_->fatalError(identifier, text);
+    zelta::Reports(errorHandler_).fatalError(identifier, text);
     throw std::runtime_error(text);
   };
   if (!stream.good()) fatal(streamFailureId, "input stream is not good()");

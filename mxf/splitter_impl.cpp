@@ -2,8 +2,9 @@
 
 #include <algorithm>
 #include <limits>
-#include <sstream>
 #include <stdexcept>
+
+#include "core/reports.h"
 
 namespace {
 
@@ -65,14 +66,12 @@ inline void MXFSplitter::Impl::storePosition() {
 }
 
 void MXFSplitter::Impl::fatal(const MXFUID& identifier, const std::string& message) {
-  if (errorHandler_) errorHandler_->fatalError(identifier, message);
+  zelta::Reports(errorHandler_).fatalError(identifier, message);
   throw std::runtime_error(message);
 }
 
 void MXFSplitter::Impl::fatal(const MXFUID& identifier, const char* text, const KLVKey& key) {
-  std::ostringstream message;
-  message << text << " - " << key;
-  fatal(identifier, message.str());
+  fatal(identifier, zelta::detailed(text, zelta::keyText(key)));
 }
 
 void MXFSplitter::Impl::openPartition() {
@@ -260,7 +259,7 @@ void MXFSplitter::Impl::endPartitionPack(const KLVKey& key) {
   try {
     internalize(buffer_, pack);
   } catch (const util::assertion_failure& failure) {
-    fatal(partitionValueId, std::string("invalid partition value - ") + failure.what());
+    fatal(partitionValueId, zelta::detailed("invalid partition value", failure.what()));
   }
   partitionKey_ = key;
   pack_ = pack;
@@ -277,8 +276,8 @@ void MXFSplitter::Impl::endRandomIndexPack(const KLVKey& key) {
     internalize(buffer_, entries, currentForm_);
     check(!entries.empty(), "has entries");
   } catch (const util::assertion_failure& failure) {
-    if (errorHandler_)
-      errorHandler_->error(randomIndexValueId, std::string("invalid random index value - ") + failure.what());
+    zelta::Reports(errorHandler_)
+        .error(randomIndexValueId, zelta::detailed("invalid random index value", failure.what()));
     return;
   }
   structureHandler_->randomIndex(entries);

@@ -1,5 +1,6 @@
 #include <string>
 
+#include "core/reports.h"
 #include "mxf.h"
 
 namespace {
@@ -15,8 +16,8 @@ bool isGeneralizedPattern(const KLVKey& pattern) {
 }
 
 std::string versionMessage(const char* text, const MXFPartitionPack& pack) {
-  return std::string(text) + " - " + std::to_string(pack.majorVersion) + "." + std::to_string(pack.minorVersion) +
-         " (implemented 1.2-1.3)";
+  return zelta::detailed(text, std::to_string(pack.majorVersion) + "." + std::to_string(pack.minorVersion) +
+                                   " (implemented 1.2-1.3)");
 }
 
 }  // namespace
@@ -32,7 +33,7 @@ public:
   void endPartition(const KLVKey& key);
   void randomIndex(const std::vector<MXFRandomIndexEntry>& entries);
 
-  ErrorHandler* errorHandler = nullptr;
+  zelta::Reports reports;
   Locator* locator = nullptr;
 
 private:
@@ -53,8 +54,6 @@ private:
   void checkOffsets(MXFPartitionKind kind, const MXFPartitionPack& pack, std::uint64_t packLength);
   void checkKAG(const MXFPartitionPack& pack);
   void checkFields(MXFPartitionKind kind, const MXFPartitionPack& pack);
-  void warning(const MXFUID& identifier, const std::string& message);
-  void error(const MXFUID& identifier, const std::string& message);
 
   MXFStructureHandler* handler_;
   State state_ = idle;
@@ -64,14 +63,6 @@ private:
   bool headerNamesFooter_ = false;
   bool randomIndexSeen_ = false;
 };
-
-void MXFStructureValidator::Impl::warning(const MXFUID& identifier, const std::string& message) {
-  if (errorHandler) errorHandler->warning(identifier, message);
-}
-
-void MXFStructureValidator::Impl::error(const MXFUID& identifier, const std::string& message) {
-  if (errorHandler) errorHandler->error(identifier, message);
-}
 
 void MXFStructureValidator::Impl::setRunIn(std::uint32_t runIn) {
   check(state_ == idle, "before run-in");
@@ -95,7 +86,8 @@ void MXFStructureValidator::Impl::startStream() {
 // A file must give a reader a way to find its end.
 void MXFStructureValidator::Impl::endStream(bool aborted) {
   if (!aborted && !headerNamesFooter_ && !randomIndexSeen_)
-    error(randomIndexMissingId, "missing random index or non-zero footerPartition in the header partition pack");
+    reports.error(randomIndexMissingId,
+                  "missing random index or non-zero footerPartition in the header partition pack");
   state_ = idle;
   locator = nullptr;
   handler_->endStream(aborted);
@@ -119,16 +111,16 @@ void MXFStructureValidator::Impl::startPartition(const KLVKey& key, const MXFPar
 void MXFStructureValidator::Impl::checkOrder(MXFPartitionKind kind) {
   switch (state_) {
     case started:
-      if (kind != MXFHeaderPartition) error(partitionOrderId, "missing header partition");
+      if (kind != MXFHeaderPartition) reports.error(partitionOrderId, "missing header partition");
       break;
     case betweenPartitions:
-      if (kind == MXFHeaderPartition) error(partitionOrderId, "unexpected header partition");
+      if (kind == MXFHeaderPartition) reports.error(partitionOrderId, "unexpected header partition");
       break;
     case afterFooter:
-      error(partitionOrderId, "unexpected partition");
+      reports.error(partitionOrderId, "unexpected partition");
       break;
     case afterRandomIndex:
-      error(randomIndexMissingId, "unexpected partition");
+      reports.error(randomIndexMissingId, "unexpected partition");
       break;
     default:
       check(false, "before partition");
@@ -139,18 +131,18 @@ void MXFStructureValidator::Impl::checkOrder(MXFPartitionKind kind) {
 // A run-in is allowed with the specialized patterns only.
 void MXFStructureValidator::Impl::checkRunIn(const MXFPartitionPack& pack) {
   if (runIn_ != 0 && isGeneralizedPattern(pack.operationalPattern))
-    error(runInErrorId, "generalized operational pattern with run-in");
+    reports.error(runInErrorId, "generalized operational pattern with run-in");
 }
 
 void MXFStructureValidator::Impl::checkVersion(const MXFPartitionPack& pack) {
   if (pack.majorVersion > 0xFF || pack.minorVersion > 0xFF)
-    error(partitionVersionErrorId, versionMessage("invalid version", pack));
+    reports.error(partitionVersionErrorId, versionMessage("invalid version", pack));
   else if (pack.majorVersion != 1)
-    error(partitionVersionErrorId, versionMessage("incompatible version", pack));
+    reports.error(partitionVersionErrorId, versionMessage("incompatible version", pack));
   else if (pack.minorVersion < 2)
-    error(partitionVersionRangeId, versionMessage("earlier version", pack));
+    reports.error(partitionVersionRangeId, versionMessage("earlier version", pack));
   else if (pack.minorVersion > 3)
-    warning(partitionVersionRangeId, versionMessage("later version", pack));
+    reports.warning(partitionVersionRangeId, versionMessage("later version", pack));
 }
 
 // Offsets count from the end of the run-in.
@@ -158,14 +150,15 @@ void MXFStructureValidator::Impl::checkOffsets(MXFPartitionKind kind, const MXFP
                                                std::uint64_t packLength) {
   const std::uint64_t at =
       static_cast<std::uint64_t>(std::streamoff(locator->getPosition())) - packLength - runIn_;
-  if (at != pack.thisPartition) warning(thisPartitionId, "incorrect thisPartition");
+  if (at != pack.thisPartition) reports.warning(thisPartitionId, "incorrect thisPartition");
   const std::uint64_t previous = partitions_.empty() ? 0 : partitions_.back().byteOffset;
-  if (previous != pack.previousPartition) warning(previousPartitionId, "incorrect previousPartition");
+  if (previous != pack.previousPartition) reports.warning(previousPartitionId, "incorrect previousPartition");
   if (kind == MXFFooterPartition) {
-    if (at != pack.footerPartition) warning(footerPartitionId, "incorrect footerPartition");
-    if (footer_ != 0 && footer_ != at) warning(footerPartitionId, "incorrect previous footerPartition");
+    if (at != pack.footerPartition) reports.warning(footerPartitionId, "incorrect footerPartition");
+    if (footer_ != 0 && footer_ != at) reports.warning(footerPartitionId, "incorrect previous footerPartition");
   } else if (pack.footerPartition != 0) {
-    if (footer_ != 0 && footer_ != pack.footerPartition) warning(footerPartitionId, "inconsistent footerPartition");
+    if (footer_ != 0 && footer_ != pack.footerPartition)
+      reports.warning(footerPartitionId, "inconsistent footerPartition");
     footer_ = pack.footerPartition;
   }
   partitions_.push_back(MXFRandomIndexEntry{pack.bodySID, at});
@@ -174,16 +167,16 @@ void MXFStructureValidator::Impl::checkOffsets(MXFPartitionKind kind, const MXFP
 void MXFStructureValidator::Impl::checkKAG(const MXFPartitionPack& pack) {
   if (pack.kagSize == 0) return;
   if (pack.headerByteCount % pack.kagSize != 0)
-    warning(headerByteCountKagId, "headerByteCount is not a multiple of kagSize");
+    reports.warning(headerByteCountKagId, "headerByteCount is not a multiple of kagSize");
   if (pack.indexByteCount % pack.kagSize != 0)
-    warning(indexByteCountKagId, "indexByteCount is not a multiple of kagSize");
+    reports.warning(indexByteCountKagId, "indexByteCount is not a multiple of kagSize");
 }
 
 void MXFStructureValidator::Impl::checkFields(MXFPartitionKind kind, const MXFPartitionPack& pack) {
   if ((pack.indexSID == 0) != (pack.indexByteCount == 0))
-    warning(indexSIDId, "inconsistent indexSID and indexByteCount");
-  if (pack.bodySID == 0 && pack.bodyOffset != 0) warning(bodySIDId, "inconsistent bodySID and bodyOffset");
-  if (kind == MXFFooterPartition && pack.bodySID != 0) warning(bodySIDId, "non-zero bodySID in footer");
+    reports.warning(indexSIDId, "inconsistent indexSID and indexByteCount");
+  if (pack.bodySID == 0 && pack.bodyOffset != 0) reports.warning(bodySIDId, "inconsistent bodySID and bodyOffset");
+  if (kind == MXFFooterPartition && pack.bodySID != 0) reports.warning(bodySIDId, "non-zero bodySID in footer");
 }
 
 void MXFStructureValidator::Impl::endPartition(const KLVKey& key) {
@@ -203,12 +196,12 @@ void MXFStructureValidator::Impl::endPartition(const KLVKey& key) {
 void MXFStructureValidator::Impl::randomIndex(const std::vector<MXFRandomIndexEntry>& entries) {
   randomIndexSeen_ = true;
   if (state_ == started || state_ == afterRandomIndex) {
-    error(randomIndexMissingId, "unexpected random index");
+    reports.error(randomIndexMissingId, "unexpected random index");
   } else {
     check(state_ == betweenPartitions || state_ == afterFooter, "before random index");
   }
   state_ = afterRandomIndex;
-  if (locator && entries != partitions_) warning(randomIndexValueId, "incorrect random index value");
+  if (locator && entries != partitions_) reports.warning(randomIndexValueId, "incorrect random index value");
   handler_->randomIndex(entries);
 }
 
@@ -229,5 +222,5 @@ void MXFStructureValidator::endPartition(const KLVKey& key) { impl_->endPartitio
 void MXFStructureValidator::randomIndex(const std::vector<MXFRandomIndexEntry>& entries) {
   impl_->randomIndex(entries);
 }
-void MXFStructureValidator::setErrorHandler(ErrorHandler* errorHandler) { impl_->errorHandler = errorHandler; }
+void MXFStructureValidator::setErrorHandler(ErrorHandler* errorHandler) { impl_->reports.setHandler(errorHandler); }
 void MXFStructureValidator::setLocator(Locator* locator) { impl_->locator = locator; }
