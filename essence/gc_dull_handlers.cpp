@@ -1,5 +1,11 @@
 #include "mxf.h"
 
+MXFGCStructureHandler::~MXFGCStructureHandler() = default;
+
+MXFGCSystemHandler::~MXFGCSystemHandler() = default;
+
+MXFGCEssenceHandler::~MXFGCEssenceHandler() = default;
+
 void DullMXFGCStructureHandler::start(std::uint64_t) {}
 void DullMXFGCStructureHandler::end() {}
 void DullMXFGCStructureHandler::startEditUnit() {}

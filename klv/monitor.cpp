@@ -2,6 +2,8 @@
 
 KLVMonitor::KLVMonitor(KLVHandler* handler) : KLVCountingFilter(handler) {}
 
+const std::streampos& KLVMonitor::MonitoredLocator::getPosition() { return position_; }
+
 Locator* KLVMonitor::getLocator() { return &locator_; }
 
 unsigned KLVMonitor::getLengthOctets() const {

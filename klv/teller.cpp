@@ -2,6 +2,8 @@
 
 KLVTeller::KLVTeller(std::istream& stream, KLVHandler* handler) : KLVCountingFilter(handler), stream_(&stream) {}
 
+const std::streampos& InputLocator::getPosition() { return position_; }
+
 Locator* KLVTeller::getLocator() { return &locator_; }
 
 // tellg() fails on a stream at end of file, although the position is known:

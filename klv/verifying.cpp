@@ -30,6 +30,8 @@ std::string unexpectedLength(std::uint64_t expected, std::uint64_t actual) {
 
 }  // namespace
 
+const std::streampos& NullLocator::getPosition() { return position_; }
+
 VerifyingKLVHandler::VerifyingKLVHandler(std::istream& stream, KLVHandler* handler)
     : stream_(&stream), handler_(handler) {}
 

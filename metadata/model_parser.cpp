@@ -10,6 +10,8 @@ using zelta::identifierText;
 
 MXFMetadataModelHandler::~MXFMetadataModelHandler() = default;
 
+dangling_ref_base::~dangling_ref_base() = default;
+
 MXFMetadataModelParser::MXFMetadataModelParser(MXFMetadataModelHandler* handler,
                                                const std::shared_ptr<MXFMetadataFactory>& factory)
     : handler_(handler), factory_(factory) {}

@@ -13,6 +13,8 @@ constexpr std::uint64_t twoOctetLengthLimit = 0x10000;
 
 }  // namespace
 
+MXFMetadataHandler::~MXFMetadataHandler() = default;
+
 MXFMetadataParser::MXFMetadataParser(MXFMetadataHandler* handler) : handler_(handler) {
   check(handler != nullptr, "handler is present");
 }

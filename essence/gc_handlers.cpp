@@ -1,7 +1,0 @@
-#include "mxf.h"
-
-MXFGCStructureHandler::~MXFGCStructureHandler() = default;
-
-MXFGCSystemHandler::~MXFGCSystemHandler() = default;
-
-MXFGCEssenceHandler::~MXFGCEssenceHandler() = default;

@@ -1,3 +1,0 @@
-#include "metadata.h"
-
-dangling_ref_base::~dangling_ref_base() = default;

@@ -1,3 +1,0 @@
-#include "mxf.h"
-
-MXFMetadataHandler::~MXFMetadataHandler() = default;
