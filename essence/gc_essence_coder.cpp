@@ -4,8 +4,6 @@ namespace {
 
 // The automatic choice: four-octet lengths, and eight-octet ones for what
 // four cannot hold.
-constexpr std::uint8_t shortElementForm = 0x83;
-constexpr std::uint8_t longElementForm = 0x87;
 constexpr std::uint64_t longElementLength = 0x1000000;
 
 }  // namespace
@@ -37,7 +35,7 @@ void MXFGCEssenceCoder::essenceLengthForm(std::uint8_t form) { lengthForm_ = for
 // and is never copied, not even into a buffer offered downstream.
 void MXFGCEssenceCoder::writeElement(const KLVKey& key, const std::uint8_t* data, std::uint64_t length) {
   std::uint8_t form = lengthForm_;
-  if (form == KLVNoLengthForm) form = length < longElementLength ? shortElementForm : longElementForm;
+  if (form == KLVNoLengthForm) form = length < longElementLength ? KLVFourOctetLengthForm : KLVEightOctetLengthForm;
   handler_->setLengthForm(form);
   std::uint8_t* buffer = nullptr;
   if (handler_->startIndividualItem(key, length, buffer))

@@ -3,14 +3,12 @@
 #include <algorithm>
 #include <cstring>
 
+#include "core/reservation.h"
+
 namespace {
 
 // From this length on an element is delivered only into a handler's buffer.
 constexpr std::uint64_t largestOwnBufferElement = 0x1000000;
-
-// Lengths of system items come from the file: a damaged one must not make the
-// splitter allocate what the stream never holds.
-constexpr std::uint64_t largestReservation = 65536;
 
 }  // namespace
 
@@ -42,7 +40,7 @@ void MXFGCSplitterImpl::endStream() {
 }
 
 void MXFGCSplitterImpl::setLengthForm(std::uint8_t form) {
-  if (form != 0x83 && form != 0x87)
+  if (form != KLVFourOctetLengthForm && form != KLVEightOctetLengthForm)
     reports.warning(nonStandardLengthFormId, zelta::detailed("non-standard BER length form", zelta::octetText(form)));
   form_ = form;
 }
@@ -230,7 +228,7 @@ void MXFGCSplitterImpl::enterSystem(const KLVKey& key) {
 bool MXFGCSplitterImpl::startFixedPack(const KLVKey& key, std::uint64_t length) {
   if (!startSystemElement(key, "expected fixed length pack")) return false;
   filling_ = &fixedPack_;
-  fixedPack_.reserve(std::min(length, largestReservation));
+  fixedPack_.reserve(zelta::reservationFor(length));
   return true;
 }
 
@@ -240,14 +238,14 @@ void MXFGCSplitterImpl::startLocalItem(std::uint32_t tag, std::uint64_t length) 
   requireSystem("expected local item");
   localItems_.emplace_back(static_cast<std::uint16_t>(tag), ByteVector());
   filling_ = &localItems_.back().second;
-  filling_->reserve(std::min(length, largestReservation));
+  filling_->reserve(zelta::reservationFor(length));
 }
 
 void MXFGCSplitterImpl::startVariableItem(std::uint64_t length) {
   requireSystem("expected variable length item");
   variableItems_.emplace_back();
   filling_ = &variableItems_.back();
-  filling_->reserve(std::min(length, largestReservation));
+  filling_->reserve(zelta::reservationFor(length));
 }
 
 bool MXFGCSplitterImpl::endsSystemElement(const char* expected) const {

@@ -1,12 +1,5 @@
 #include "mxf.h"
 
-namespace {
-
-// Fill items carry four-octet lengths, like the packs around them.
-constexpr std::uint8_t fillLengthForm = 0x83;
-
-}  // namespace
-
 MXFGCStructurePadder::MXFGCStructurePadder(KLVHandler* handler, Locator* locator)
     : locator_(locator), filler_(handler) {}
 
@@ -14,7 +7,8 @@ void MXFGCStructurePadder::start(std::uint64_t kagSize) {
   kagSize_ = kagSize;
   filler_.setLocator(locator_);
   filler_.startStream(true);
-  filler_.setLengthForm(fillLengthForm);
+  // Fill items carry four-octet lengths, like the packs around them.
+  filler_.setLengthForm(KLVFourOctetLengthForm);
 }
 
 void MXFGCStructurePadder::end() { filler_.endStream(false); }

@@ -2,10 +2,6 @@
 
 namespace {
 
-// System elements carry four-octet lengths, so that a rewrite in place
-// never has to change the size of a length.
-constexpr std::uint8_t systemLengthForm = 0x83;
-
 void writeVariableLengthPack(KLVHandler& handler, const KLVKey& key, const MXFGCVariableItems& items,
                              std::uint8_t form) {
   KLVLengthType lengthType = KLVLengthTypeBER;
@@ -30,20 +26,21 @@ MXFGCSystemCoder::MXFGCSystemCoder(KLVHandler* handler) : handler_(handler) {}
 
 bool MXFGCSystemCoder::startSystemElement(const KLVKey&) { return true; }
 
-// System items are small: copying them widens their tags to what the KLV
-// helper takes.
+// System elements carry four-octet lengths, so that a rewrite in place never
+// has to change the size of a length. System items are small: copying them
+// widens their tags to what the KLV helper takes.
 void MXFGCSystemCoder::systemLocalSet(const KLVKey& key, const MXFGCLocalItems& items) {
   const KLVLocalItems wide(items.begin(), items.end());
-  handler_->setLengthForm(systemLengthForm);
-  writeLocalSet(*handler_, key, wide, systemLengthForm);
+  handler_->setLengthForm(KLVFourOctetLengthForm);
+  writeLocalSet(*handler_, key, wide, KLVFourOctetLengthForm);
 }
 
 void MXFGCSystemCoder::systemFixedPack(const KLVKey& key, const ByteVector& bytes) {
-  handler_->setLengthForm(systemLengthForm);
+  handler_->setLengthForm(KLVFourOctetLengthForm);
   writeFixedLengthPack(*handler_, key, bytes);
 }
 
 void MXFGCSystemCoder::systemVariablePack(const KLVKey& key, const MXFGCVariableItems& items) {
-  handler_->setLengthForm(systemLengthForm);
-  writeVariableLengthPack(*handler_, key, items, systemLengthForm);
+  handler_->setLengthForm(KLVFourOctetLengthForm);
+  writeVariableLengthPack(*handler_, key, items, KLVFourOctetLengthForm);
 }

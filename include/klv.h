@@ -577,6 +577,11 @@ const char* KLVLengthTypeLabel(KLVLengthType lengthType);
 
 // The BER form value that no stream ever has: the start of every current form.
 inline constexpr std::uint8_t KLVNoLengthForm = 0x80;
+// The long forms of four and of eight length octets after the first: the
+// format's lengths of structure, metadata and index, and of essence that
+// four octets cannot hold.
+inline constexpr std::uint8_t KLVFourOctetLengthForm = 0x83;
+inline constexpr std::uint8_t KLVEightOctetLengthForm = 0x87;
 
 // Octets of a BER length of a form: 1 for short form, (form & 127) + 1 for
 // long form ("valid BER length form").

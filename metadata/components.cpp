@@ -66,10 +66,8 @@ const PropertyTable<Component>& propertyTable<Component>() {
   typedef Component C;
   static const PropertyTable<C> table(
       "Component", formatSetKey(0x02),
-      {requiredValue("Component.dataDefinition", standardKey(0x0201), 0x0201, &C::getDataDefinition,
-                     &C::setDataDefinition),
-       optionalValue("Component.duration", standardKey(0x0202), 0x0202, &C::getDuration, &C::setDuration,
-                     &C::hasDuration)});
+      {requiredValue("Component.dataDefinition", 0x0201, &C::getDataDefinition, &C::setDataDefinition),
+       optionalValue("Component.duration", 0x0202, &C::getDuration, &C::setDuration, &C::hasDuration)});
   return table;
 }
 
@@ -84,8 +82,8 @@ const PropertyTable<Sequence>& propertyTable<Sequence>() {
   typedef Sequence C;
   static const PropertyTable<C> table(
       "Sequence", formatSetKey(0x0F),
-      {referenceVector<C, Component>("Sequence.components", "Sequence.component", standardKey(0x1001), 0x1001,
-                                     &C::getComponentCount, &C::getComponentAt, &C::insertComponentAt)});
+      {referenceVector<C, Component>("Sequence.components", "Sequence.component", 0x1001, &C::getComponentCount,
+                                     &C::getComponentAt, &C::insertComponentAt)});
   return table;
 }
 
@@ -94,10 +92,8 @@ const PropertyTable<SourceReference>& propertyTable<SourceReference>() {
   typedef SourceReference C;
   static const PropertyTable<C> table(
       "SourceReference", formatSetKey(0x10),
-      {requiredValue("SourceReference.sourcePackageID", standardKey(0x1101), 0x1101, &C::getSourcePackageID,
-                     &C::setSourcePackageID),
-       requiredValue("SourceReference.sourceTrackID", standardKey(0x1102), 0x1102, &C::getSourceTrackID,
-                     &C::setSourceTrackID)});
+      {requiredValue("SourceReference.sourcePackageID", 0x1101, &C::getSourcePackageID, &C::setSourcePackageID),
+       requiredValue("SourceReference.sourceTrackID", 0x1102, &C::getSourceTrackID, &C::setSourceTrackID)});
   return table;
 }
 
@@ -106,18 +102,16 @@ const PropertyTable<SourceClip>& propertyTable<SourceClip>() {
   typedef SourceClip C;
   static const PropertyTable<C> table(
       "SourceClip", formatSetKey(0x11),
-      {requiredValue("SourceClip.startPosition", standardKey(0x1201), 0x1201, &C::getStartPosition,
-                     &C::setStartPosition)});
+      {requiredValue("SourceClip.startPosition", 0x1201, &C::getStartPosition, &C::setStartPosition)});
   return table;
 }
 
 template <>
 const PropertyTable<DMSourceClip>& propertyTable<DMSourceClip>() {
   typedef DMSourceClip C;
-  static const PropertyTable<C> table(
-      "DMSourceClip", formatSetKey(0x45),
-      {optionalValue("DMSourceClip.targetTrackIDs", standardKey(0x6103), 0x6103, &C::getTargetTrackIDs,
-                     &C::setTargetTrackIDs, &C::hasTargetTrackIDs)});
+  static const PropertyTable<C> table("DMSourceClip", formatSetKey(0x45),
+                                      {optionalValue("DMSourceClip.targetTrackIDs", 0x6103, &C::getTargetTrackIDs,
+                                                     &C::setTargetTrackIDs, &C::hasTargetTrackIDs)});
   return table;
 }
 
@@ -126,12 +120,10 @@ const PropertyTable<TimecodeComponent>& propertyTable<TimecodeComponent>() {
   typedef TimecodeComponent C;
   static const PropertyTable<C> table(
       "TimecodeComponent", formatSetKey(0x14),
-      {requiredValue("TimecodeComponent.startTimecode", standardKey(0x1501), 0x1501, &C::getStartTimecode,
-                     &C::setStartTimecode),
-       requiredValue("TimecodeComponent.roundedTimecodeBase", standardKey(0x1502), 0x1502,
-                     &C::getRoundedTimecodeBase, &C::setRoundedTimecodeBase),
-       requiredValue("TimecodeComponent.dropFrame", standardKey(0x1503), 0x1503, &C::getDropFrame,
-                     &C::setDropFrame)});
+      {requiredValue("TimecodeComponent.startTimecode", 0x1501, &C::getStartTimecode, &C::setStartTimecode),
+       requiredValue("TimecodeComponent.roundedTimecodeBase", 0x1502, &C::getRoundedTimecodeBase,
+                     &C::setRoundedTimecodeBase),
+       requiredValue("TimecodeComponent.dropFrame", 0x1503, &C::getDropFrame, &C::setDropFrame)});
   return table;
 }
 

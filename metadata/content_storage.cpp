@@ -73,12 +73,12 @@ const PropertyTable<ContentStorage>& propertyTable<ContentStorage>() {
   typedef ContentStorage C;
   static const PropertyTable<C> table(
       "ContentStorage", formatSetKey(0x18),
-      {referenceVector<C, GenericPackage>("ContentStorage.packages", "ContentStorage.package", standardKey(0x1901),
-                                          0x1901, &C::getPackageCount, &C::getPackageAt, &C::insertPackageAt),
-       referenceVector<C, EssenceContainerData>(
-           "ContentStorage.essenceContainerData", "ContentStorage.essenceContainerData", standardKey(0x1902), 0x1902,
-           &C::getEssenceContainerDataCount, &C::getEssenceContainerDataAt, &C::insertEssenceContainerDataAt,
-           &C::hasEssenceContainerData)});
+      {referenceVector<C, GenericPackage>("ContentStorage.packages", "ContentStorage.package", 0x1901,
+                                          &C::getPackageCount, &C::getPackageAt, &C::insertPackageAt),
+       referenceVector<C, EssenceContainerData>("ContentStorage.essenceContainerData",
+                                                "ContentStorage.essenceContainerData", 0x1902,
+                                                &C::getEssenceContainerDataCount, &C::getEssenceContainerDataAt,
+                                                &C::insertEssenceContainerDataAt, &C::hasEssenceContainerData)});
   return table;
 }
 
@@ -87,11 +87,9 @@ const PropertyTable<EssenceContainerData>& propertyTable<EssenceContainerData>()
   typedef EssenceContainerData C;
   static const PropertyTable<C> table(
       "EssenceContainerData", formatSetKey(0x23),
-      {requiredValue("EssenceContainerData.linkedPackageUID", standardKey(0x2701), 0x2701, &C::getLinkedPackageUID,
-                     &C::setLinkedPackageUID),
-       optionalValue("EssenceContainerData.indexSID", standardKey(0x3F06), 0x3F06, &C::getIndexSID, &C::setIndexSID,
-                     &C::hasIndexSID),
-       requiredValue("EssenceContainerData.bodySID", standardKey(0x3F07), 0x3F07, &C::getBodySID, &C::setBodySID)});
+      {requiredValue("EssenceContainerData.linkedPackageUID", 0x2701, &C::getLinkedPackageUID, &C::setLinkedPackageUID),
+       optionalValue("EssenceContainerData.indexSID", 0x3F06, &C::getIndexSID, &C::setIndexSID, &C::hasIndexSID),
+       requiredValue("EssenceContainerData.bodySID", 0x3F07, &C::getBodySID, &C::setBodySID)});
   return table;
 }
 

@@ -63,10 +63,8 @@ const PropertyTable<Event>& propertyTable<Event>() {
   typedef Event C;
   static const PropertyTable<C> table(
       "Event", formatSetKey(0x06),
-      {optionalValue("Event.position", standardKey(0x0601), 0x0601, &C::getPosition, &C::setPosition,
-                     &C::hasPosition),
-       optionalValue("Event.comment", standardKey(0x0602), 0x0602, &C::getComment, &C::setComment,
-                     &C::hasComment)});
+      {optionalValue("Event.position", 0x0601, &C::getPosition, &C::setPosition, &C::hasPosition),
+       optionalValue("Event.comment", 0x0602, &C::getComment, &C::setComment, &C::hasComment)});
   return table;
 }
 
@@ -78,8 +76,8 @@ const PropertyTable<CommentMarker>& propertyTable<CommentMarker>() {
                                                                  0x01, 0x01, 0x04, 0x02, 0x0A, 0x00, 0x00});
   static const PropertyTable<C> table(
       "CommentMarker", formatSetKey(0x08),
-      {strongReference<C, SourceReference>("CommentMarker.annotation", annotationKey, 0x0901,
-                                           &C::getAnnotation, &C::setAnnotation, &C::hasAnnotation)});
+      {strongReference<C, SourceReference>("CommentMarker.annotation", {annotationKey, 0x0901}, &C::getAnnotation,
+                                           &C::setAnnotation, &C::hasAnnotation)});
   return table;
 }
 
@@ -88,11 +86,10 @@ const PropertyTable<DMSegment>& propertyTable<DMSegment>() {
   typedef DMSegment C;
   static const PropertyTable<C> table(
       "DMSegment", formatSetKey(0x41),
-      {optionalValue("DMSegment.targetTrackIDs", standardKey(0x6102), 0x6102, &C::getTargetTrackIDs,
-                     &C::setTargetTrackIDs, &C::hasTargetTrackIDs),
-       strongReference<C, DescriptiveMetadataFramework>("DMSegment.dmFramework", standardKey(0x6101), 0x6101,
-                                                        &C::getDMFramework, &C::setDMFramework,
-                                                        &C::hasDMFramework)});
+      {optionalValue("DMSegment.targetTrackIDs", 0x6102, &C::getTargetTrackIDs, &C::setTargetTrackIDs,
+                     &C::hasTargetTrackIDs),
+       strongReference<C, DescriptiveMetadataFramework>("DMSegment.dmFramework", 0x6101, &C::getDMFramework,
+                                                        &C::setDMFramework, &C::hasDMFramework)});
   return table;
 }
 

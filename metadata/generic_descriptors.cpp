@@ -136,14 +136,13 @@ const PropertyTable<GenericDescriptor>& propertyTable<GenericDescriptor>() {
   typedef GenericDescriptor C;
   static const PropertyTable<C> table(
       "GenericDescriptor", formatSetKey(0x24),
-      {referenceVector<C, GenericLocator>("GenericDescriptor.locators", "GenericDescriptor.locator",
-                                          standardKey(0x2F01), 0x2F01, &C::getLocatorCount, &C::getLocatorAt,
-                                          &C::insertLocatorAt, &C::hasLocators, &C::markLocatorsPresent),
-       referenceVector<C, SubDescriptor>("GenericDescriptor.genericSubDescriptors",
-                                         "GenericDescriptor.genericSubDescriptor", genericSubDescriptorsKey, 0,
-                                         &C::getGenericSubDescriptorCount, &C::getGenericSubDescriptorAt,
-                                         &C::insertGenericSubDescriptorAt, &C::hasGenericSubDescriptors,
-                                         &C::markGenericSubDescriptorsPresent)});
+      {referenceVector<C, GenericLocator>("GenericDescriptor.locators", "GenericDescriptor.locator", 0x2F01,
+                                          &C::getLocatorCount, &C::getLocatorAt, &C::insertLocatorAt, &C::hasLocators,
+                                          &C::markLocatorsPresent),
+       referenceVector<C, SubDescriptor>(
+           "GenericDescriptor.genericSubDescriptors", "GenericDescriptor.genericSubDescriptor",
+           {genericSubDescriptorsKey, 0}, &C::getGenericSubDescriptorCount, &C::getGenericSubDescriptorAt,
+           &C::insertGenericSubDescriptorAt, &C::hasGenericSubDescriptors, &C::markGenericSubDescriptorsPresent)});
   return table;
 }
 
@@ -152,13 +151,13 @@ const PropertyTable<FileDescriptor>& propertyTable<FileDescriptor>() {
   typedef FileDescriptor C;
   static const PropertyTable<C> table(
       "FileDescriptor", formatSetKey(0x25),
-      {optionalStandard("FileDescriptor.linkedTrackID", 0x3006, &C::getLinkedTrackID, &C::setLinkedTrackID,
-                        &C::hasLinkedTrackID),
-       requiredStandard("FileDescriptor.sampleRate", 0x3001, &C::getSampleRate, &C::setSampleRate),
-       optionalStandard("FileDescriptor.containerDuration", 0x3002, &C::getContainerDuration, &C::setContainerDuration,
-                        &C::hasContainerDuration),
-       requiredStandard("FileDescriptor.essenceContainer", 0x3004, &C::getEssenceContainer, &C::setEssenceContainer),
-       optionalStandard("FileDescriptor.codec", 0x3005, &C::getCodec, &C::setCodec, &C::hasCodec)});
+      {optionalValue("FileDescriptor.linkedTrackID", 0x3006, &C::getLinkedTrackID, &C::setLinkedTrackID,
+                     &C::hasLinkedTrackID),
+       requiredValue("FileDescriptor.sampleRate", 0x3001, &C::getSampleRate, &C::setSampleRate),
+       optionalValue("FileDescriptor.containerDuration", 0x3002, &C::getContainerDuration, &C::setContainerDuration,
+                     &C::hasContainerDuration),
+       requiredValue("FileDescriptor.essenceContainer", 0x3004, &C::getEssenceContainer, &C::setEssenceContainer),
+       optionalValue("FileDescriptor.codec", 0x3005, &C::getCodec, &C::setCodec, &C::hasCodec)});
   return table;
 }
 
@@ -168,8 +167,8 @@ const PropertyTable<MultipleDescriptor>& propertyTable<MultipleDescriptor>() {
   static const PropertyTable<C> table(
       "MultipleDescriptor", formatSetKey(0x44),
       {referenceVector<C, FileDescriptor>("MultipleDescriptor.subDescriptors", "MultipleDescriptor.subDescriptor",
-                                          standardKey(0x3F01), 0x3F01, &C::getSubDescriptorCount,
-                                          &C::getSubDescriptorAt, &C::insertSubDescriptorAt)});
+                                          0x3F01, &C::getSubDescriptorCount, &C::getSubDescriptorAt,
+                                          &C::insertSubDescriptorAt)});
   return table;
 }
 

@@ -27,7 +27,7 @@ template <>
 const PropertyTable<NetworkLocator>& propertyTable<NetworkLocator>() {
   static const PropertyTable<NetworkLocator> table(
       "NetworkLocator", formatSetKey(0x32),
-      {requiredValue("NetworkLocator.urlString", standardKey(0x4001), 0x4001, &NetworkLocator::getURLString,
+      {requiredValue("NetworkLocator.urlString", 0x4001, &NetworkLocator::getURLString,
                      &NetworkLocator::setURLString)});
   return table;
 }
@@ -36,8 +36,7 @@ template <>
 const PropertyTable<TextLocator>& propertyTable<TextLocator>() {
   static const PropertyTable<TextLocator> table(
       "TextLocator", formatSetKey(0x33),
-      {requiredValue("TextLocator.locatorName", standardKey(0x4101), 0x4101, &TextLocator::getLocatorName,
-                     &TextLocator::setLocatorName)});
+      {requiredValue("TextLocator.locatorName", 0x4101, &TextLocator::getLocatorName, &TextLocator::setLocatorName)});
   return table;
 }
 

@@ -19,9 +19,8 @@ namespace zelta {
 template <>
 const PropertyTable<MetadataObject>& propertyTable<MetadataObject>() {
   static const PropertyTable<MetadataObject> table(
-      "MetadataObject",
-      formatSetKey(0x01),
-      {optionalValue("MetadataObject.generationUID", standardKey(0x0102), 0x0102, &MetadataObject::getGenerationUID,
+      "MetadataObject", formatSetKey(0x01),
+      {optionalValue("MetadataObject.generationUID", 0x0102, &MetadataObject::getGenerationUID,
                      &MetadataObject::setGenerationUID, &MetadataObject::hasGenerationUID)});
   return table;
 }

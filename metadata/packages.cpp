@@ -63,15 +63,14 @@ const PropertyTable<GenericPackage>& propertyTable<GenericPackage>() {
   typedef GenericPackage C;
   static const PropertyTable<C> table(
       "GenericPackage", formatSetKey(0x34),
-      {requiredValue("GenericPackage.packageUID", standardKey(0x4401), 0x4401, &C::getPackageUID,
-                     &C::setPackageUID),
-       optionalValue("GenericPackage.name", standardKey(0x4402), 0x4402, &C::getName, &C::setName, &C::hasName),
-       requiredValue("GenericPackage.packageCreationDate", standardKey(0x4405), 0x4405, &C::getPackageCreationDate,
+      {requiredValue("GenericPackage.packageUID", 0x4401, &C::getPackageUID, &C::setPackageUID),
+       optionalValue("GenericPackage.name", 0x4402, &C::getName, &C::setName, &C::hasName),
+       requiredValue("GenericPackage.packageCreationDate", 0x4405, &C::getPackageCreationDate,
                      &C::setPackageCreationDate),
-       requiredValue("GenericPackage.packageModifiedDate", standardKey(0x4404), 0x4404, &C::getPackageModifiedDate,
+       requiredValue("GenericPackage.packageModifiedDate", 0x4404, &C::getPackageModifiedDate,
                      &C::setPackageModifiedDate),
-       referenceVector<C, Track>("GenericPackage.tracks", "GenericPackage.track", standardKey(0x4403), 0x4403,
-                                 &C::getTrackCount, &C::getTrackAt, &C::insertTrackAt)});
+       referenceVector<C, Track>("GenericPackage.tracks", "GenericPackage.track", 0x4403, &C::getTrackCount,
+                                 &C::getTrackAt, &C::insertTrackAt)});
   return table;
 }
 
@@ -84,10 +83,9 @@ const PropertyTable<MaterialPackage>& propertyTable<MaterialPackage>() {
 template <>
 const PropertyTable<SourcePackage>& propertyTable<SourcePackage>() {
   typedef SourcePackage C;
-  static const PropertyTable<C> table(
-      "SourcePackage", formatSetKey(0x37),
-      {strongReference<C, GenericDescriptor>("SourcePackage.descriptor", standardKey(0x4701), 0x4701,
-                                             &C::getDescriptor, &C::setDescriptor)});
+  static const PropertyTable<C> table("SourcePackage", formatSetKey(0x37),
+                                      {strongReference<C, GenericDescriptor>("SourcePackage.descriptor", 0x4701,
+                                                                             &C::getDescriptor, &C::setDescriptor)});
   return table;
 }
 

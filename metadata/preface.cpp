@@ -90,23 +90,20 @@ const PropertyTable<Preface>& propertyTable<Preface>() {
   typedef Preface C;
   static const PropertyTable<C> table(
       "Preface", formatSetKey(0x2F),
-      {requiredValue("Preface.lastModifiedDate", standardKey(0x3B02), 0x3B02, &C::getLastModifiedDate,
-                     &C::setLastModifiedDate),
-       requiredValue("Preface.version", standardKey(0x3B05), 0x3B05, &C::getVersion, &C::setVersion),
-       optionalValue("Preface.objectModelVersion", standardKey(0x3B07), 0x3B07, &C::getObjectModelVersion,
-                     &C::setObjectModelVersion, &C::hasObjectModelVersion),
-       weakReference<C, GenericPackage>("Preface.primaryPackage", standardKey(0x3B08), 0x3B08,
-                                        &C::getPrimaryPackage, &C::setPrimaryPackage, &C::hasPrimaryPackage),
-       referenceVector<C, Identification>("Preface.identifications", "Preface.identification", standardKey(0x3B06),
-                                          0x3B06, &C::getIdentificationCount, &C::getIdentificationAt,
+      {requiredValue("Preface.lastModifiedDate", 0x3B02, &C::getLastModifiedDate, &C::setLastModifiedDate),
+       requiredValue("Preface.version", 0x3B05, &C::getVersion, &C::setVersion),
+       optionalValue("Preface.objectModelVersion", 0x3B07, &C::getObjectModelVersion, &C::setObjectModelVersion,
+                     &C::hasObjectModelVersion),
+       weakReference<C, GenericPackage>("Preface.primaryPackage", 0x3B08, &C::getPrimaryPackage, &C::setPrimaryPackage,
+                                        &C::hasPrimaryPackage),
+       referenceVector<C, Identification>("Preface.identifications", "Preface.identification", 0x3B06,
+                                          &C::getIdentificationCount, &C::getIdentificationAt,
                                           &C::insertIdentificationAt),
-       strongReference<C, ContentStorage>("Preface.contentStorage", standardKey(0x3B03), 0x3B03,
-                                          &C::getContentStorage, &C::setContentStorage),
-       requiredValue("Preface.operationalPattern", standardKey(0x3B09), 0x3B09, &C::getOperationalPattern,
-                     &C::setOperationalPattern),
-       requiredValue("Preface.essenceContainers", standardKey(0x3B0A), 0x3B0A, &C::getEssenceContainers,
-                     &C::setEssenceContainers),
-       requiredValue("Preface.dmSchemes", standardKey(0x3B0B), 0x3B0B, &C::getDMSchemes, &C::setDMSchemes)});
+       strongReference<C, ContentStorage>("Preface.contentStorage", 0x3B03, &C::getContentStorage,
+                                          &C::setContentStorage),
+       requiredValue("Preface.operationalPattern", 0x3B09, &C::getOperationalPattern, &C::setOperationalPattern),
+       requiredValue("Preface.essenceContainers", 0x3B0A, &C::getEssenceContainers, &C::setEssenceContainers),
+       requiredValue("Preface.dmSchemes", 0x3B0B, &C::getDMSchemes, &C::setDMSchemes)});
   return table;
 }
 
@@ -115,24 +112,17 @@ const PropertyTable<Identification>& propertyTable<Identification>() {
   typedef Identification C;
   static const PropertyTable<C> table(
       "Identification", formatSetKey(0x30),
-      {requiredValue("Identification.thisGenerationUID", standardKey(0x3C09), 0x3C09, &C::getThisGenerationUID,
-                     &C::setThisGenerationUID),
-       requiredValue("Identification.companyName", standardKey(0x3C01), 0x3C01, &C::getCompanyName,
-                     &C::setCompanyName),
-       requiredValue("Identification.productName", standardKey(0x3C02), 0x3C02, &C::getProductName,
-                     &C::setProductName),
-       optionalValue("Identification.productVersion", standardKey(0x3C03), 0x3C03, &C::getProductVersion,
-                     &C::setProductVersion, &C::hasProductVersion),
-       requiredValue("Identification.versionString", standardKey(0x3C04), 0x3C04, &C::getVersionString,
-                     &C::setVersionString),
-       requiredValue("Identification.productUID", standardKey(0x3C05), 0x3C05, &C::getProductUID,
-                     &C::setProductUID),
-       requiredValue("Identification.modificationDate", standardKey(0x3C06), 0x3C06, &C::getModificationDate,
-                     &C::setModificationDate),
-       optionalValue("Identification.toolkitVersion", standardKey(0x3C07), 0x3C07, &C::getToolkitVersion,
-                     &C::setToolkitVersion, &C::hasToolkitVersion),
-       optionalValue("Identification.platform", standardKey(0x3C08), 0x3C08, &C::getPlatform, &C::setPlatform,
-                     &C::hasPlatform)});
+      {requiredValue("Identification.thisGenerationUID", 0x3C09, &C::getThisGenerationUID, &C::setThisGenerationUID),
+       requiredValue("Identification.companyName", 0x3C01, &C::getCompanyName, &C::setCompanyName),
+       requiredValue("Identification.productName", 0x3C02, &C::getProductName, &C::setProductName),
+       optionalValue("Identification.productVersion", 0x3C03, &C::getProductVersion, &C::setProductVersion,
+                     &C::hasProductVersion),
+       requiredValue("Identification.versionString", 0x3C04, &C::getVersionString, &C::setVersionString),
+       requiredValue("Identification.productUID", 0x3C05, &C::getProductUID, &C::setProductUID),
+       requiredValue("Identification.modificationDate", 0x3C06, &C::getModificationDate, &C::setModificationDate),
+       optionalValue("Identification.toolkitVersion", 0x3C07, &C::getToolkitVersion, &C::setToolkitVersion,
+                     &C::hasToolkitVersion),
+       optionalValue("Identification.platform", 0x3C08, &C::getPlatform, &C::setPlatform, &C::hasPlatform)});
   return table;
 }
 

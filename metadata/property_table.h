@@ -136,6 +136,17 @@ const PropertyTable<C>& propertyTable();
 // class tables do not spell the keys a second time.
 inline const KLVKey& standardKey(std::uint16_t tag) { return getMXFStandardPrimerKeys().at(tag); }
 
+// Where a property stands: its key and its static local tag, 0 for a key
+// that gets a dynamic tag when coded. A tag alone names the key that the
+// standard primer gives it, so that a table row spells each tag once.
+struct PropertyKey {
+  PropertyKey(std::uint16_t standardTag) : key(standardKey(standardTag)), tag(standardTag) {}
+  PropertyKey(const KLVKey& key, std::uint16_t tag) : key(key), tag(tag) {}
+
+  KLVKey key;
+  std::uint16_t tag;
+};
+
 // The set key of a class of the format: 06 0E 2B 34 02 53 01 01 0D 01 01 01 01 01,
 // the class octet, 00.
 inline KLVKey formatSetKey(std::uint8_t classOctet) {
@@ -175,9 +186,12 @@ void removeOwned(MetadataRoot& owner, std::vector<std::shared_ptr<T>>& elements,
 // Descriptors by kind of property, over the accessors of the class.
 
 template <typename C, typename T>
-PropertyDescriptor<C> requiredValue(const std::string& name, const KLVKey& key, std::uint16_t tag,
-                                    const T& (C::*getter)() const, void (C::*setter)(const T&)) {
-  return {name, key, tag, Presence::required,
+PropertyDescriptor<C> requiredValue(const std::string& name, const PropertyKey& property, const T& (C::*getter)() const,
+                                    void (C::*setter)(const T&)) {
+  return {name,
+          property.key,
+          property.tag,
+          Presence::required,
           [setter](const std::shared_ptr<C>& object, const ByteVector& bytes, MXFPendingReferences&) {
             T value;
             internalize(bytes, value);
@@ -191,10 +205,9 @@ PropertyDescriptor<C> requiredValue(const std::string& name, const KLVKey& key, 
 }
 
 template <typename C, typename T>
-PropertyDescriptor<C> optionalValue(const std::string& name, const KLVKey& key, std::uint16_t tag,
-                                    const T& (C::*getter)() const, void (C::*setter)(const T&),
-                                    bool (C::*has)() const) {
-  PropertyDescriptor<C> descriptor = requiredValue(name, key, tag, getter, setter);
+PropertyDescriptor<C> optionalValue(const std::string& name, const PropertyKey& property, const T& (C::*getter)() const,
+                                    void (C::*setter)(const T&), bool (C::*has)() const) {
+  PropertyDescriptor<C> descriptor = requiredValue(name, property, getter, setter);
   descriptor.presence = Presence::optional;
   descriptor.code = [getter, has](const C& object, ByteVector& bytes, MXFReferencedObjects&) {
     if (!(object.*has)()) return false;
@@ -207,11 +220,14 @@ PropertyDescriptor<C> optionalValue(const std::string& name, const KLVKey& key, 
 // A single reference; a null has means required. Strong references list
 // their target among the owned objects, weak ones only name it.
 template <typename C, typename V>
-PropertyDescriptor<C> singleReference(const std::string& name, const KLVKey& key, std::uint16_t tag, bool strong,
+PropertyDescriptor<C> singleReference(const std::string& name, const PropertyKey& property, bool strong,
                                       std::shared_ptr<const V> (C::*getter)() const,
                                       void (C::*setter)(const std::shared_ptr<V>&), bool (C::*has)() const) {
   const std::string isPresent = name + " is present";
-  return {name, key, tag, has ? Presence::optional : Presence::required,
+  return {name,
+          property.key,
+          property.tag,
+          has ? Presence::optional : Presence::required,
           [setter, strong](const std::shared_ptr<C>& object, const ByteVector& bytes, MXFPendingReferences& pending) {
             MXFUID target;
             internalize(bytes, target);
@@ -229,18 +245,17 @@ PropertyDescriptor<C> singleReference(const std::string& name, const KLVKey& key
 }
 
 template <typename C, typename V>
-PropertyDescriptor<C> strongReference(const std::string& name, const KLVKey& key, std::uint16_t tag,
+PropertyDescriptor<C> strongReference(const std::string& name, const PropertyKey& property,
                                       std::shared_ptr<const V> (C::*getter)() const,
-                                      void (C::*setter)(const std::shared_ptr<V>&),
-                                      bool (C::*has)() const = nullptr) {
-  return singleReference<C, V>(name, key, tag, true, getter, setter, has);
+                                      void (C::*setter)(const std::shared_ptr<V>&), bool (C::*has)() const = nullptr) {
+  return singleReference<C, V>(name, property, true, getter, setter, has);
 }
 
 template <typename C, typename V>
-PropertyDescriptor<C> weakReference(const std::string& name, const KLVKey& key, std::uint16_t tag,
+PropertyDescriptor<C> weakReference(const std::string& name, const PropertyKey& property,
                                     std::shared_ptr<const V> (C::*getter)() const,
                                     void (C::*setter)(const std::shared_ptr<V>&), bool (C::*has)() const = nullptr) {
-  return singleReference<C, V>(name, key, tag, false, getter, setter, has);
+  return singleReference<C, V>(name, property, false, getter, setter, has);
 }
 
 // A vector of strong references, written as a batch of identifiers; the
@@ -248,14 +263,17 @@ PropertyDescriptor<C> weakReference(const std::string& name, const KLVKey& key, 
 // element. A null has means required; an optional vector is marked present
 // as soon as it is read, so that an empty batch stays present.
 template <typename C, typename V>
-PropertyDescriptor<C> referenceVector(const std::string& name, const std::string& elementName, const KLVKey& key,
-                                      std::uint16_t tag, std::size_t (C::*count)() const,
+PropertyDescriptor<C> referenceVector(const std::string& name, const std::string& elementName,
+                                      const PropertyKey& property, std::size_t (C::*count)() const,
                                       std::shared_ptr<const V> (C::*at)(std::size_t) const,
                                       void (C::*inserter)(std::size_t, const std::shared_ptr<V>&),
                                       bool (C::*has)() const = nullptr, void (C::*markPresent)() = nullptr) {
   typedef dangling_vector_ref_t<C, V> Element;
   const std::string isPresent = elementName + " is present";
-  return {name, key, tag, has ? Presence::optional : Presence::required,
+  return {name,
+          property.key,
+          property.tag,
+          has ? Presence::optional : Presence::required,
           [inserter, markPresent](const std::shared_ptr<C>& object, const ByteVector& bytes,
                                   MXFPendingReferences& pending) {
             std::vector<MXFUID> targets;
@@ -280,19 +298,6 @@ PropertyDescriptor<C> referenceVector(const std::string& name, const std::string
             return true;
           },
           MXFPropertyKind::strongReferenceVector};
-}
-
-// A value of class C whose key is in the standard primer, by its tag.
-template <typename C, typename T>
-PropertyDescriptor<C> optionalStandard(const std::string& name, std::uint16_t tag, const T& (C::*getter)() const,
-                                       void (C::*setter)(const T&), bool (C::*has)() const) {
-  return optionalValue(name, standardKey(tag), tag, getter, setter, has);
-}
-
-template <typename C, typename T>
-PropertyDescriptor<C> requiredStandard(const std::string& name, std::uint16_t tag, const T& (C::*getter)() const,
-                                       void (C::*setter)(const T&)) {
-  return requiredValue(name, standardKey(tag), tag, getter, setter);
 }
 
 }  // namespace zelta

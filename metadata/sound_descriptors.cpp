@@ -40,18 +40,17 @@ const PropertyTable<SoundDescriptor>& propertyTable<SoundDescriptor>() {
   typedef SoundDescriptor C;
   static const PropertyTable<C> table(
       "SoundDescriptor", formatSetKey(0x42),
-      {requiredStandard("SoundDescriptor.audioSamplingRate", 0x3D03, &C::getAudioSamplingRate,
-                        &C::setAudioSamplingRate),
-       requiredStandard("SoundDescriptor.locked", 0x3D02, &C::getLocked, &C::setLocked),
-       optionalStandard("SoundDescriptor.audioReferenceLevel", 0x3D04, &C::getAudioReferenceLevel,
-                        &C::setAudioReferenceLevel, &C::hasAudioReferenceLevel),
-       optionalStandard("SoundDescriptor.electroSpatialFormulation", 0x3D05, &C::getElectroSpatialFormulation,
-                        &C::setElectroSpatialFormulation, &C::hasElectroSpatialFormulation),
-       requiredStandard("SoundDescriptor.channelCount", 0x3D07, &C::getChannelCount, &C::setChannelCount),
-       requiredStandard("SoundDescriptor.quantizationBits", 0x3D01, &C::getQuantizationBits, &C::setQuantizationBits),
-       optionalStandard("SoundDescriptor.dialNorm", 0x3D0C, &C::getDialNorm, &C::setDialNorm, &C::hasDialNorm),
-       optionalStandard("SoundDescriptor.soundEssenceCompression", 0x3D06, &C::getSoundEssenceCompression,
-                        &C::setSoundEssenceCompression, &C::hasSoundEssenceCompression)});
+      {requiredValue("SoundDescriptor.audioSamplingRate", 0x3D03, &C::getAudioSamplingRate, &C::setAudioSamplingRate),
+       requiredValue("SoundDescriptor.locked", 0x3D02, &C::getLocked, &C::setLocked),
+       optionalValue("SoundDescriptor.audioReferenceLevel", 0x3D04, &C::getAudioReferenceLevel,
+                     &C::setAudioReferenceLevel, &C::hasAudioReferenceLevel),
+       optionalValue("SoundDescriptor.electroSpatialFormulation", 0x3D05, &C::getElectroSpatialFormulation,
+                     &C::setElectroSpatialFormulation, &C::hasElectroSpatialFormulation),
+       requiredValue("SoundDescriptor.channelCount", 0x3D07, &C::getChannelCount, &C::setChannelCount),
+       requiredValue("SoundDescriptor.quantizationBits", 0x3D01, &C::getQuantizationBits, &C::setQuantizationBits),
+       optionalValue("SoundDescriptor.dialNorm", 0x3D0C, &C::getDialNorm, &C::setDialNorm, &C::hasDialNorm),
+       optionalValue("SoundDescriptor.soundEssenceCompression", 0x3D06, &C::getSoundEssenceCompression,
+                     &C::setSoundEssenceCompression, &C::hasSoundEssenceCompression)});
   return table;
 }
 
@@ -60,8 +59,8 @@ const PropertyTable<DataDescriptor>& propertyTable<DataDescriptor>() {
   typedef DataDescriptor C;
   static const PropertyTable<C> table(
       "DataDescriptor", formatSetKey(0x43),
-      {optionalStandard("DataDescriptor.dataEssenceCoding", 0x3E01, &C::getDataEssenceCoding, &C::setDataEssenceCoding,
-                        &C::hasDataEssenceCoding)});
+      {optionalValue("DataDescriptor.dataEssenceCoding", 0x3E01, &C::getDataEssenceCoding, &C::setDataEssenceCoding,
+                     &C::hasDataEssenceCoding)});
   return table;
 }
 

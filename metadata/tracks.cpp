@@ -46,12 +46,10 @@ const PropertyTable<Track>& propertyTable<Track>() {
   typedef Track C;
   static const PropertyTable<C> table(
       "Track", formatSetKey(0x38),
-      {requiredValue("Track.trackID", standardKey(0x4801), 0x4801, &C::getTrackID, &C::setTrackID),
-       optionalValue("Track.trackNumber", standardKey(0x4804), 0x4804, &C::getTrackNumber, &C::setTrackNumber,
-                     &C::hasTrackNumber),
-       optionalValue("Track.trackName", standardKey(0x4802), 0x4802, &C::getTrackName, &C::setTrackName,
-                     &C::hasTrackName),
-       strongReference<C, Segment>("Track.segment", standardKey(0x4803), 0x4803, &C::getSegment, &C::setSegment)});
+      {requiredValue("Track.trackID", 0x4801, &C::getTrackID, &C::setTrackID),
+       optionalValue("Track.trackNumber", 0x4804, &C::getTrackNumber, &C::setTrackNumber, &C::hasTrackNumber),
+       optionalValue("Track.trackName", 0x4802, &C::getTrackName, &C::setTrackName, &C::hasTrackName),
+       strongReference<C, Segment>("Track.segment", 0x4803, &C::getSegment, &C::setSegment)});
   return table;
 }
 
@@ -60,8 +58,8 @@ const PropertyTable<TimelineTrack>& propertyTable<TimelineTrack>() {
   typedef TimelineTrack C;
   static const PropertyTable<C> table(
       "TimelineTrack", formatSetKey(0x3B),
-      {requiredValue("TimelineTrack.editRate", standardKey(0x4B01), 0x4B01, &C::getEditRate, &C::setEditRate),
-       requiredValue("TimelineTrack.origin", standardKey(0x4B02), 0x4B02, &C::getOrigin, &C::setOrigin)});
+      {requiredValue("TimelineTrack.editRate", 0x4B01, &C::getEditRate, &C::setEditRate),
+       requiredValue("TimelineTrack.origin", 0x4B02, &C::getOrigin, &C::setOrigin)});
   return table;
 }
 
@@ -70,9 +68,8 @@ const PropertyTable<EventTrack>& propertyTable<EventTrack>() {
   typedef EventTrack C;
   static const PropertyTable<C> table(
       "EventTrack", formatSetKey(0x39),
-      {requiredValue("EventTrack.editRate", standardKey(0x4901), 0x4901, &C::getEditRate, &C::setEditRate),
-       optionalValue("EventTrack.origin", standardKey(0x4902), 0x4902, &C::getOrigin, &C::setOrigin,
-                     &C::hasOrigin)});
+      {requiredValue("EventTrack.editRate", 0x4901, &C::getEditRate, &C::setEditRate),
+       optionalValue("EventTrack.origin", 0x4902, &C::getOrigin, &C::setOrigin, &C::hasOrigin)});
   return table;
 }
 

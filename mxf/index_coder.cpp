@@ -3,9 +3,6 @@
 
 namespace {
 
-// Every length of an index region is written in four octets.
-constexpr std::uint8_t indexForm = 0x83;
-
 template <typename T>
 ByteVector bytesOf(const T& value) {
   ByteVector bytes;
@@ -63,7 +60,8 @@ void MXFIndexCoder::startIndex() {
   open_ = true;
   filler_.setLocator(monitor_.getLocator());
   filler_.startStream(true);
-  filler_.setLengthForm(indexForm);
+  // Every length of an index region is written in four octets.
+  filler_.setLengthForm(KLVFourOctetLengthForm);
   filler_.setFillMode(KLVFiller::alignmentMode, kagSize_, 0);
   filler_.startFilledItem();
 }
@@ -74,7 +72,8 @@ void MXFIndexCoder::indexTableSegment(const MXFIndexTableSegment& segment) {
   check(open_, "before index table segment");
   filler_.endFilledItem();
   filler_.startFilledItem();
-  writeLocalSet(filler_, MXFIndexTableSegmentKey, segmentItems(segment, codesAllIndexProperties()), indexForm);
+  writeLocalSet(filler_, MXFIndexTableSegmentKey, segmentItems(segment, codesAllIndexProperties()),
+                KLVFourOctetLengthForm);
 }
 
 // The last segment gets no fill: the padder of the region takes over.

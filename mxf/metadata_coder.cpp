@@ -6,8 +6,6 @@
 
 namespace {
 
-// Every length of header metadata is written in four octets.
-constexpr std::uint8_t metadataForm = 0x83;
 constexpr std::uint8_t shortForm = 1;
 constexpr std::uint64_t shortFormLimit = 128;
 constexpr std::uint16_t tagOctets = 2;
@@ -25,7 +23,7 @@ void deliverValue(KLVHandler& handler, std::uint8_t* buffer, const ByteVector& b
   handler.value(buffer, static_cast<std::streamsize>(bytes.size()));
 }
 
-std::uint8_t itemForm(std::size_t size) { return size < shortFormLimit ? shortForm : metadataForm; }
+std::uint8_t itemForm(std::size_t size) { return size < shortFormLimit ? shortForm : KLVFourOctetLengthForm; }
 
 std::uint64_t itemLengthOctets(KLVLengthType lengthType, std::size_t size) {
   if (lengthType == KLVLengthTypeBER) return lengthFormOctets(itemForm(size));
@@ -67,7 +65,8 @@ void MXFMetadataCoder::start() {
   tags_.clear();
   filler_.setLocator(monitor_.getLocator());
   filler_.startStream(true);
-  filler_.setLengthForm(metadataForm);
+  // Every length of header metadata is written in four octets.
+  filler_.setLengthForm(KLVFourOctetLengthForm);
   filler_.setFillMode(KLVFiller::alignmentMode, 0, 0);
   filler_.startFilledItem();
 }
@@ -149,5 +148,5 @@ void MXFMetadataCoder::codeSet(const MXFPrimedSet& set) {
     }
   }
   filler_.endLocalSet(set.key);
-  if (ber) filler_.setLengthForm(metadataForm);
+  if (ber) filler_.setLengthForm(KLVFourOctetLengthForm);
 }

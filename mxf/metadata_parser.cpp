@@ -1,13 +1,12 @@
 #include <algorithm>
 
 #include "core/reports.h"
+#include "core/reservation.h"
 #include "mxf.h"
 #include "mxf/primer.h"
 
 namespace {
 
-// The form that the format asks of every length in header metadata.
-constexpr std::uint8_t standardForm = 0x83;
 // An item that needs more than two length octets justifies BER item lengths.
 constexpr std::uint64_t twoOctetLengthLimit = 0x10000;
 
@@ -42,7 +41,8 @@ void MXFMetadataParser::setLengthForm(std::uint8_t form) {
 
 bool MXFMetadataParser::startLocalSet(const KLVKey& key, std::uint64_t length, KLVTagType tagType,
                                       KLVLengthType lengthType) {
-  if (formChanged_ && lastForm_ != standardForm) {
+  // The format asks four-octet lengths of all header metadata.
+  if (formChanged_ && lastForm_ != KLVFourOctetLengthForm) {
     formChanged_ = false;
     zelta::Reports(getErrorHandler())
         .warning(nonStandardCodingId, zelta::detailed("non-standard BER length form", zelta::octetText(lastForm_)));
@@ -72,7 +72,7 @@ bool MXFMetadataParser::startLocalItem(std::uint32_t tag, std::uint64_t length, 
 // Only the first primer of the stream counts; any other pack is skipped.
 bool MXFMetadataParser::startFixedLengthPack(const KLVKey& key, std::uint64_t length, std::uint8_t*&) {
   if (getState() != beforePrimer || key != MXFPrimerPackKey) return false;
-  primerBytes_.reserve(std::min(length, zelta::mxf::largestReservation));
+  primerBytes_.reserve(zelta::reservationFor(length));
   setState(inPrimer);
   return true;
 }

@@ -1,6 +1,7 @@
 #include <algorithm>
 
 #include "core/reports.h"
+#include "core/reservation.h"
 #include "mxf.h"
 #include "mxf/primer.h"
 
@@ -45,7 +46,7 @@ bool MXFPrimedSetParser::startLocalItem(std::uint32_t tag, std::uint64_t length,
     return false;
   }
   property_ = inserted.first;
-  property_->second.reserve(std::min(length, zelta::mxf::largestReservation));
+  property_->second.reserve(zelta::reservationFor(length));
   return true;
 }
 

@@ -12,10 +12,6 @@ namespace zelta::mxf {
 // Octets of an entry as written: a two-octet tag and a key.
 inline constexpr std::uint32_t primerEntrySize = 18;
 
-// The most that a parser reserves ahead of a value: a damaged length must
-// not take memory before the read finds it short.
-inline constexpr std::uint64_t largestReservation = 1 << 20;
-
 // Count, entry size, entries. A larger entry size is skipped over; a smaller
 // one, a cut entry or octets after the last entry fail.
 MXFPrimerEntries decodePrimer(const ByteVector& bytes);

@@ -5,6 +5,7 @@
 #include <stdexcept>
 
 #include "core/reports.h"
+#include "core/reservation.h"
 
 namespace {
 
@@ -12,10 +13,6 @@ namespace {
 std::uint64_t saturatingSum(std::uint64_t a, std::uint64_t b) {
   return a > std::numeric_limits<std::uint64_t>::max() - b ? std::numeric_limits<std::uint64_t>::max() : a + b;
 }
-
-// The announced length of a pack is a hint for the buffer only: a damaged
-// length must not make the splitter allocate what the stream never holds.
-constexpr std::uint64_t largestReservation = 65536;
 
 }  // namespace
 
@@ -235,7 +232,7 @@ bool MXFSplitter::Impl::startFixedLengthPack(const KLVKey& key, std::uint64_t le
 bool MXFSplitter::Impl::startPack(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
   state_ = isMXFRandomIndexKey(key) ? inRandomIndex : inPartitionPack;
   buffer_.clear();
-  buffer_.reserve(static_cast<std::size_t>(std::min(length, largestReservation)));
+  buffer_.reserve(zelta::reservationFor(length));
   buffer = nullptr;
   return true;
 }

@@ -1,13 +1,5 @@
 #include "mxf.h"
 
-namespace {
-
-// Packs are written with four-octet lengths, so that a rewrite of a pack
-// never has to change the size of its length.
-constexpr std::uint8_t packLengthForm = 0x83;
-
-}  // namespace
-
 MXFStructureCoder::MXFStructureCoder(KLVHandler* handler, Locator* locator, KLVStreamPadder* headerPadder,
                                      KLVStreamPadder* indexPadder)
     : filler_(handler), locator_(locator), headerPadder_(headerPadder), indexPadder_(indexPadder) {
@@ -57,7 +49,9 @@ void MXFStructureCoder::startPartition(const KLVKey& key, const MXFPartitionPack
   ByteVector value;
   externalize(value, written, true);
   filler_.startFilledItem();
-  filler_.setLengthForm(packLengthForm);
+  // Packs are written with four-octet lengths, so that a rewrite of a pack
+  // never has to change the size of its length.
+  filler_.setLengthForm(KLVFourOctetLengthForm);
   writeFixedLengthPack(filler_, key, value);
   filler_.endFilledItem();
 }
@@ -66,8 +60,8 @@ void MXFStructureCoder::endPartition(const KLVKey&) {}
 
 void MXFStructureCoder::randomIndex(const std::vector<MXFRandomIndexEntry>&) {
   ByteVector value;
-  externalize(value, partitions_, packLengthForm);
-  filler_.setLengthForm(packLengthForm);
+  externalize(value, partitions_, KLVFourOctetLengthForm);
+  filler_.setLengthForm(KLVFourOctetLengthForm);
   writeFixedLengthPack(filler_, MXFRandomIndexPackKey, value);
 }
 

@@ -70,29 +70,29 @@ namespace {
 
 const PropertyTable<Album>& albumTable() {
   static const PropertyTable<Album> table(
-      "Album", {zelta::requiredValue("Album.version", testPropertyKey(0x01), 0x7F01, &Album::getVersion,
-                                     &Album::setVersion),
-                zelta::referenceVector<Album, Song>("Album.songs", "Album.song", testPropertyKey(0x03), 0x7F03,
-                                                    &Album::getSongCount, &Album::getSongAt, &Album::insertSongAt),
-                zelta::strongReference<Album, Artwork>("Album.artwork", testPropertyKey(0x04), 0x7F04,
-                                                       &Album::getArtwork, &Album::setArtwork, &Album::hasArtwork),
-                zelta::weakReference<Album, Song>("Album.favourite", testPropertyKey(0x05), 0x7F05,
-                                                  &Album::getFavourite, &Album::setFavourite, &Album::hasFavourite)});
+      "Album",
+      {zelta::requiredValue("Album.version", {testPropertyKey(0x01), 0x7F01}, &Album::getVersion, &Album::setVersion),
+       zelta::referenceVector<Album, Song>("Album.songs", "Album.song", {testPropertyKey(0x03), 0x7F03},
+                                           &Album::getSongCount, &Album::getSongAt, &Album::insertSongAt),
+       zelta::strongReference<Album, Artwork>("Album.artwork", {testPropertyKey(0x04), 0x7F04}, &Album::getArtwork,
+                                              &Album::setArtwork, &Album::hasArtwork),
+       zelta::weakReference<Album, Song>("Album.favourite", {testPropertyKey(0x05), 0x7F05}, &Album::getFavourite,
+                                         &Album::setFavourite, &Album::hasFavourite)});
   return table;
 }
 
 const PropertyTable<Song>& songTable() {
   static const PropertyTable<Song> table(
-      "Song", {zelta::requiredValue("Song.number", testPropertyKey(0x11), 0x7F11, &Song::getNumber, &Song::setNumber),
-               zelta::referenceVector<Song, Credit>("Song.credits", "Song.credit", testPropertyKey(0x12), 0x7F12,
-                                                    &Song::getCreditCount, &Song::getCreditAt,
-                                                    &Song::insertCreditAt, &Song::hasCredits)});
+      "Song", {zelta::requiredValue("Song.number", {testPropertyKey(0x11), 0x7F11}, &Song::getNumber, &Song::setNumber),
+               zelta::referenceVector<Song, Credit>("Song.credits", "Song.credit", {testPropertyKey(0x12), 0x7F12},
+                                                    &Song::getCreditCount, &Song::getCreditAt, &Song::insertCreditAt,
+                                                    &Song::hasCredits)});
   return table;
 }
 
 const PropertyTable<LiveSong>& liveSongTable() {
   static const PropertyTable<LiveSong> table(
-      "LiveSong", {zelta::requiredValue("LiveSong.venue", testPropertyKey(0x21), 0x8001, &LiveSong::getVenue,
+      "LiveSong", {zelta::requiredValue("LiveSong.venue", {testPropertyKey(0x21), 0x8001}, &LiveSong::getVenue,
                                         &LiveSong::setVenue)});
   return table;
 }
@@ -100,15 +100,15 @@ const PropertyTable<LiveSong>& liveSongTable() {
 const PropertyTable<Credit>& creditTable() {
   static const PropertyTable<Credit> table(
       "Credit",
-      {zelta::requiredValue("Credit.role", testPropertyKey(0x31), 0x7F31, &Credit::getRole, &Credit::setRole),
-       zelta::weakReference<Credit, Song>("Credit.performer", testPropertyKey(0x32), 0x7F32, &Credit::getPerformer,
+      {zelta::requiredValue("Credit.role", {testPropertyKey(0x31), 0x7F31}, &Credit::getRole, &Credit::setRole),
+       zelta::weakReference<Credit, Song>("Credit.performer", {testPropertyKey(0x32), 0x7F32}, &Credit::getPerformer,
                                           &Credit::setPerformer, &Credit::hasPerformer)});
   return table;
 }
 
 const PropertyTable<Artwork>& artworkTable() {
   static const PropertyTable<Artwork> table(
-      "Artwork", {zelta::optionalValue("Artwork.size", testPropertyKey(0x41), 0x7F41, &Artwork::getSize,
+      "Artwork", {zelta::optionalValue("Artwork.size", {testPropertyKey(0x41), 0x7F41}, &Artwork::getSize,
                                        &Artwork::setSize, &Artwork::hasSize)});
   return table;
 }
