@@ -4,7 +4,7 @@ MXFGCSplitter::MXFGCSplitter() : MXFGCSplitter(nullptr, nullptr, nullptr) {}
 
 MXFGCSplitter::MXFGCSplitter(MXFGCStructureHandler* structureHandler, MXFGCSystemHandler* systemHandler,
                              MXFGCEssenceHandler* essenceHandler)
-    : impl_(new MXFGCSplitterImpl(*this, structureHandler, systemHandler, essenceHandler)) {}
+    : impl_(new Impl(*this, structureHandler, systemHandler, essenceHandler)) {}
 
 MXFGCSplitter::~MXFGCSplitter() = default;
 

@@ -12,14 +12,14 @@ constexpr std::uint64_t largestOwnBufferElement = 0x1000000;
 
 }  // namespace
 
-MXFGCSplitterImpl::MXFGCSplitterImpl(const MXFGCSplitter& owner, MXFGCStructureHandler* structure,
+MXFGCSplitter::Impl::Impl(const MXFGCSplitter& owner, MXFGCStructureHandler* structure,
                                      MXFGCSystemHandler* system, MXFGCEssenceHandler* essence)
     : structureHandler(structure), systemHandler(system), essenceHandler(essence), owner_(owner) {}
 
 // ---------------------------------------------------------------------------
 // Stream and edit units
 
-void MXFGCSplitterImpl::startStream(bool hasAccurateLengths) {
+void MXFGCSplitter::Impl::startStream(bool hasAccurateLengths) {
   check(state_ == idle, "before start");
   check(hasAccurateLengths, "has accurate lengths");
   form_ = KLVNoLengthForm;
@@ -30,7 +30,7 @@ void MXFGCSplitterImpl::startStream(bool hasAccurateLengths) {
 }
 
 // Idle on every path, also when a handler throws.
-void MXFGCSplitterImpl::endStream() {
+void MXFGCSplitter::Impl::endStream() {
   const bool openUnit = inEditUnit();
   const bool open = state_ != idle;
   state_ = idle;
@@ -39,21 +39,21 @@ void MXFGCSplitterImpl::endStream() {
   if (open) structureHandler->end();
 }
 
-void MXFGCSplitterImpl::setLengthForm(std::uint8_t form) {
+void MXFGCSplitter::Impl::setLengthForm(std::uint8_t form) {
   if (form != KLVFourOctetLengthForm && form != KLVEightOctetLengthForm)
     reports.warning(nonStandardLengthFormId, zelta::detailed("non-standard BER length form", zelta::octetText(form)));
   form_ = form;
 }
 
-bool MXFGCSplitterImpl::inEditUnit() const {
+bool MXFGCSplitter::Impl::inEditUnit() const {
   return state_ == system || state_ == essenceOnly || state_ == essenceAfterSystem;
 }
 
-bool MXFGCSplitterImpl::inEssence() const { return state_ == essenceOnly || state_ == essenceAfterSystem; }
+bool MXFGCSplitter::Impl::inEssence() const { return state_ == essenceOnly || state_ == essenceAfterSystem; }
 
 // Nothing in the stream marks an edit unit: it begins where the first key of
 // the stream comes again.
-void MXFGCSplitterImpl::editUnitBoundary(const KLVKey& key) {
+void MXFGCSplitter::Impl::editUnitBoundary(const KLVKey& key) {
   if (firstKey_ == KLVKey()) {
     firstKey_ = key;
     if (structureHandler) structureHandler->startEditUnit();
@@ -69,7 +69,7 @@ void MXFGCSplitterImpl::editUnitBoundary(const KLVKey& key) {
 // ---------------------------------------------------------------------------
 // Essence elements
 
-MXFGCSplitterImpl::Kind MXFGCSplitterImpl::kindOf(const KLVKey& key) const {
+MXFGCSplitter::Impl::Kind MXFGCSplitter::Impl::kindOf(const KLVKey& key) const {
   if (owner_.isPictureKey(key)) return picture;
   if (owner_.isSoundKey(key)) return sound;
   if (owner_.isDataKey(key)) return data;
@@ -77,7 +77,7 @@ MXFGCSplitterImpl::Kind MXFGCSplitterImpl::kindOf(const KLVKey& key) const {
   return noKind;
 }
 
-bool MXFGCSplitterImpl::startEssenceElement(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
+bool MXFGCSplitter::Impl::startEssenceElement(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
   if (key == KLVFillItemKey) return false;
   if (state_ == started || state_ == system)
     std::fill(std::begin(kinds_), std::end(kinds_), false);
@@ -103,7 +103,7 @@ bool MXFGCSplitterImpl::startEssenceElement(const KLVKey& key, std::uint64_t len
 // A container without a system item holds one kind of element: the first
 // element of a second kind is reported once, and from then on the container
 // counts as one with a system item.
-void MXFGCSplitterImpl::enterEssence(const KLVKey& key) {
+void MXFGCSplitter::Impl::enterEssence(const KLVKey& key) {
   switch (state_) {
     case started:
       state_ = essenceOnly;
@@ -125,7 +125,7 @@ void MXFGCSplitterImpl::enterEssence(const KLVKey& key) {
 }
 
 // Whether the value is to be read, and where to.
-bool MXFGCSplitterImpl::offerEssence(const KLVKey& key, std::uint64_t length) {
+bool MXFGCSplitter::Impl::offerEssence(const KLVKey& key, std::uint64_t length) {
   if (form_ != reportedForm_) {
     reportedForm_ = form_;
     if (essenceHandler) essenceHandler->essenceLengthForm(form_);
@@ -147,7 +147,7 @@ bool MXFGCSplitterImpl::offerEssence(const KLVKey& key, std::uint64_t length) {
 
 // The key tests are asked again: a subclass may answer differently now, and a
 // key of no kind is refused ("valid GC essence element key").
-void MXFGCSplitterImpl::deliver(const KLVKey& key, const std::uint8_t* bytes, std::uint64_t length) {
+void MXFGCSplitter::Impl::deliver(const KLVKey& key, const std::uint8_t* bytes, std::uint64_t length) {
   switch (kindOf(key)) {
     case picture:
       essenceHandler->pictureElement(key, bytes, length);
@@ -166,7 +166,7 @@ void MXFGCSplitterImpl::deliver(const KLVKey& key, const std::uint8_t* bytes, st
   }
 }
 
-void MXFGCSplitterImpl::endEssenceElement(const KLVKey& key) {
+void MXFGCSplitter::Impl::endEssenceElement(const KLVKey& key) {
   if (key == KLVFillItemKey) return;
   if (state_ == started || state_ == system) return;
   check(inEssence(), "expected individual item");
@@ -178,7 +178,7 @@ void MXFGCSplitterImpl::endEssenceElement(const KLVKey& key) {
 }
 
 // The reader has usually read the value in place already.
-void MXFGCSplitterImpl::essenceValue(const std::uint8_t* bytes, std::streamsize size) {
+void MXFGCSplitter::Impl::essenceValue(const std::uint8_t* bytes, std::streamsize size) {
   if (!handlerBuffer_) {
     ownBuffer_.append(bytes, size);
     return;
@@ -193,7 +193,7 @@ void MXFGCSplitterImpl::essenceValue(const std::uint8_t* bytes, std::streamsize 
 // ---------------------------------------------------------------------------
 // System elements
 
-bool MXFGCSplitterImpl::startSystemElement(const KLVKey& key, const char* expected) {
+bool MXFGCSplitter::Impl::startSystemElement(const KLVKey& key, const char* expected) {
   check(state_ != idle, expected);
   editUnitBoundary(key);
   localItems_.clear();
@@ -210,7 +210,7 @@ bool MXFGCSplitterImpl::startSystemElement(const KLVKey& key, const char* expect
   return wanted_;
 }
 
-void MXFGCSplitterImpl::enterSystem(const KLVKey& key) {
+void MXFGCSplitter::Impl::enterSystem(const KLVKey& key) {
   switch (state_) {
     case started:
     case system:
@@ -225,51 +225,51 @@ void MXFGCSplitterImpl::enterSystem(const KLVKey& key) {
   state_ = system;
 }
 
-bool MXFGCSplitterImpl::startFixedPack(const KLVKey& key, std::uint64_t length) {
+bool MXFGCSplitter::Impl::startFixedPack(const KLVKey& key, std::uint64_t length) {
   if (!startSystemElement(key, "expected fixed length pack")) return false;
   filling_ = &fixedPack_;
   fixedPack_.reserve(zelta::reservationFor(length));
   return true;
 }
 
-void MXFGCSplitterImpl::requireSystem(const char* expected) const { check(state_ == system, expected); }
+void MXFGCSplitter::Impl::requireSystem(const char* expected) const { check(state_ == system, expected); }
 
-void MXFGCSplitterImpl::startLocalItem(std::uint32_t tag, std::uint64_t length) {
+void MXFGCSplitter::Impl::startLocalItem(std::uint32_t tag, std::uint64_t length) {
   requireSystem("expected local item");
   localItems_.emplace_back(static_cast<std::uint16_t>(tag), ByteVector());
   filling_ = &localItems_.back().second;
   filling_->reserve(zelta::reservationFor(length));
 }
 
-void MXFGCSplitterImpl::startVariableItem(std::uint64_t length) {
+void MXFGCSplitter::Impl::startVariableItem(std::uint64_t length) {
   requireSystem("expected variable length item");
   variableItems_.emplace_back();
   filling_ = &variableItems_.back();
   filling_->reserve(zelta::reservationFor(length));
 }
 
-bool MXFGCSplitterImpl::endsSystemElement(const char* expected) const {
+bool MXFGCSplitter::Impl::endsSystemElement(const char* expected) const {
   if (state_ == started || inEssence()) return false;
   requireSystem(expected);
   return wanted_ && systemHandler;
 }
 
-void MXFGCSplitterImpl::endLocalSet(const KLVKey& key) {
+void MXFGCSplitter::Impl::endLocalSet(const KLVKey& key) {
   if (endsSystemElement("expected local set")) systemHandler->systemLocalSet(key, localItems_);
 }
 
-void MXFGCSplitterImpl::endFixedPack(const KLVKey& key) {
+void MXFGCSplitter::Impl::endFixedPack(const KLVKey& key) {
   if (endsSystemElement("expected fixed length pack")) systemHandler->systemFixedPack(key, fixedPack_);
 }
 
-void MXFGCSplitterImpl::endVariablePack(const KLVKey& key) {
+void MXFGCSplitter::Impl::endVariablePack(const KLVKey& key) {
   if (endsSystemElement("expected variable length pack")) systemHandler->systemVariablePack(key, variableItems_);
 }
 
 // ---------------------------------------------------------------------------
 // Values and other elements
 
-void MXFGCSplitterImpl::value(const std::uint8_t* bytes, std::streamsize size) {
+void MXFGCSplitter::Impl::value(const std::uint8_t* bytes, std::streamsize size) {
   if (inEssence()) {
     essenceValue(bytes, size);
     return;
@@ -278,11 +278,11 @@ void MXFGCSplitterImpl::value(const std::uint8_t* bytes, std::streamsize size) {
   filling_->insert(filling_->end(), bytes, bytes + size);
 }
 
-bool MXFGCSplitterImpl::invalidElement(const KLVKey& key) {
+bool MXFGCSplitter::Impl::invalidElement(const KLVKey& key) {
   reportKey(invalidGCElementId, "invalid GC element", key);
   return false;
 }
 
-void MXFGCSplitterImpl::reportKey(const MXFUID& identifier, const char* text, const KLVKey& key) {
+void MXFGCSplitter::Impl::reportKey(const MXFUID& identifier, const char* text, const KLVKey& key) {
   reports.error(identifier, zelta::detailed(text, zelta::keyText(key)));
 }

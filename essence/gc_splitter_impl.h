@@ -9,10 +9,10 @@
 #include "essence/gc_own_buffer.h"
 #include "mxf.h"
 
-class MXFGCSplitterImpl {
+class MXFGCSplitter::Impl {
 public:
   // The key tests are asked of the owner, so that its subclasses decide.
-  MXFGCSplitterImpl(const MXFGCSplitter& owner, MXFGCStructureHandler* structureHandler,
+  Impl(const MXFGCSplitter& owner, MXFGCStructureHandler* structureHandler,
                     MXFGCSystemHandler* systemHandler, MXFGCEssenceHandler* essenceHandler);
 
   MXFGCStructureHandler* structureHandler = nullptr;

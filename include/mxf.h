@@ -119,15 +119,9 @@ public:
 // complete KLV stream to its delegate.
 class MXFSplitter : public KLVHandler {
 public:
-  // The position that the splitter stored at the top of its current event.
-  class DelegatedLocator : public Locator {
-  public:
-    const std::streampos& getPosition() override;
-    void setPosition(const std::streampos& position) { position_ = position; }
-
-  private:
-    std::streampos position_ = -1;
-  };
+  // The position that the splitter stored at the top of its current event,
+  // which its delegates and validator see.
+  class DelegatedLocator;
 
   MXFSplitter(MXFStructureHandler* structureHandler, KLVHandler* metadataHandler, KLVHandler* indexHandler,
               KLVHandler* essenceHandler, bool validate);
@@ -769,8 +763,6 @@ public:
   void essenceLengthForm(std::uint8_t form) override;
 };
 
-class MXFGCSplitterImpl;
-
 // Turns the KLV stream of an essence container into edit units, system
 // elements and essence elements. An edit unit starts wherever the first key
 // of the stream comes again. Essence values are read straight into the
@@ -830,7 +822,8 @@ public:
   virtual bool isCompoundKey(const KLVKey& key) const;
 
 private:
-  std::unique_ptr<MXFGCSplitterImpl> impl_;
+  class Impl;
+  std::unique_ptr<Impl> impl_;
 };
 
 // ---------------------------------------------------------------------------

@@ -9,8 +9,6 @@ void DullMXFStructureHandler::startPartition(const KLVKey&, const MXFPartitionPa
 void DullMXFStructureHandler::endPartition(const KLVKey&) {}
 void DullMXFStructureHandler::randomIndex(const std::vector<MXFRandomIndexEntry>&) {}
 
-const std::streampos& MXFSplitter::DelegatedLocator::getPosition() { return position_; }
-
 MXFSplitter::MXFSplitter(MXFStructureHandler* structureHandler, KLVHandler* metadataHandler,
                          KLVHandler* indexHandler, KLVHandler* essenceHandler, bool validate)
     : impl_(new Impl(structureHandler, metadataHandler, indexHandler, essenceHandler, validate)) {}

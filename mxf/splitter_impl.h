@@ -7,6 +7,15 @@
 
 #include "mxf.h"
 
+class MXFSplitter::DelegatedLocator : public Locator {
+public:
+  const std::streampos& getPosition() override { return position_; }
+  void setPosition(const std::streampos& position) { position_ = position; }
+
+private:
+  std::streampos position_ = -1;
+};
+
 class MXFSplitter::Impl final : public KLVHandler {
 public:
   Impl(MXFStructureHandler* structureHandler, KLVHandler* metadataHandler, KLVHandler* indexHandler,
