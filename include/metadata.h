@@ -445,14 +445,6 @@ private:
 // optional one checks that it is present. Reference vectors own their
 // elements; the count of an unset optional vector is 0.
 
-namespace zelta {
-// The property table of a class, within the library.
-template <typename C>
-class PropertyTable;
-template <typename C>
-const PropertyTable<C>& propertyTable();
-}  // namespace zelta
-
 class Identification;
 class ContentStorage;
 class EssenceContainerData;
@@ -1077,8 +1069,9 @@ public:
 
 private:
   // An empty batch read from a file is present all the same, so that writing
-  // the object again keeps it; only the class's table marks it.
-  friend const zelta::PropertyTable<GenericDescriptor>& zelta::propertyTable<GenericDescriptor>();
+  // the object again keeps it; only the class's table marks it, through
+  // the library's own class that names the markers.
+  friend class GenericDescriptorPresence;
   void markLocatorsPresent() { hasLocators_ = true; }
   void markGenericSubDescriptorsPresent() { hasGenericSubDescriptors_ = true; }
 

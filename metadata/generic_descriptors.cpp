@@ -131,6 +131,17 @@ const PropertyTable<ContainerConstraintsSubDescriptor>& propertyTable<ContainerC
   return table;
 }
 
+}  // namespace zelta
+
+class GenericDescriptorPresence {
+public:
+  GenericDescriptorPresence() = delete;
+  static constexpr auto locators = &GenericDescriptor::markLocatorsPresent;
+  static constexpr auto genericSubDescriptors = &GenericDescriptor::markGenericSubDescriptorsPresent;
+};
+
+namespace zelta {
+
 template <>
 const PropertyTable<GenericDescriptor>& propertyTable<GenericDescriptor>() {
   typedef GenericDescriptor C;
@@ -138,11 +149,11 @@ const PropertyTable<GenericDescriptor>& propertyTable<GenericDescriptor>() {
       "GenericDescriptor", formatSetKey(0x24),
       {referenceVector<C, GenericLocator>("GenericDescriptor.locators", "GenericDescriptor.locator", 0x2F01,
                                           &C::getLocatorCount, &C::getLocatorAt, &C::insertLocatorAt, &C::hasLocators,
-                                          &C::markLocatorsPresent),
+                                          GenericDescriptorPresence::locators),
        referenceVector<C, SubDescriptor>(
            "GenericDescriptor.genericSubDescriptors", "GenericDescriptor.genericSubDescriptor",
            {genericSubDescriptorsKey, 0}, &C::getGenericSubDescriptorCount, &C::getGenericSubDescriptorAt,
-           &C::insertGenericSubDescriptorAt, &C::hasGenericSubDescriptors, &C::markGenericSubDescriptorsPresent)});
+           &C::insertGenericSubDescriptorAt, &C::hasGenericSubDescriptors, GenericDescriptorPresence::genericSubDescriptors)});
   return table;
 }
 
