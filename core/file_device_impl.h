@@ -19,7 +19,7 @@ extern void (*file_advice_observer)(boost::iostreams::stream_offset offset, boos
 // Throws a std::ios_base::failure whose what() is exactly the text.
 [[noreturn]] void fail_file_device(const char* text);
 
-struct file_device::impl {
+struct ZELTA_LOCAL file_device::impl {
   impl(std::ios_base::openmode open_mode, int open_hints);
   ~impl();
   impl(const impl&) = delete;

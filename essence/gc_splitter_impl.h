@@ -9,7 +9,7 @@
 #include "essence/gc_own_buffer.h"
 #include "mxf.h"
 
-class MXFGCSplitter::Impl {
+class ZELTA_LOCAL MXFGCSplitter::Impl {
 public:
   // The key tests are asked of the owner, so that its subclasses decide.
   Impl(const MXFGCSplitter& owner, MXFGCStructureHandler* structureHandler,

@@ -20,6 +20,8 @@
 #include <boost/iostreams/categories.hpp>
 #include <boost/iostreams/stream.hpp>
 
+#include "zelta_export.h"
+
 typedef std::vector<std::uint8_t> ByteVector;
 
 // ---------------------------------------------------------------------------
@@ -29,7 +31,7 @@ namespace util {
 
 // A broken rule of program logic, a caller's fault, or a malformed value in
 // already delimited octets.
-class assertion_failure : public std::exception {
+class ZELTA_EXPORT assertion_failure : public std::exception {
 public:
   explicit assertion_failure(const std::string& condition);
   const char* what() const noexcept override;
@@ -54,7 +56,7 @@ inline void check(bool condition, const std::string& text) {
 
 // A 16-octet SMPTE universal label. Octet 7, the registry version, takes no
 // part in equality or order.
-class KLVKey {
+class ZELTA_EXPORT KLVKey {
 public:
   static constexpr std::size_t size() { return 16; }
 
@@ -88,11 +90,11 @@ private:
 
 // Sixteen upper-case two-digit hexadecimal octets joined by "."; the
 // stream's flags and fill are left as they were.
-std::ostream& operator<<(std::ostream& out, const KLVKey& key);
+ZELTA_EXPORT std::ostream& operator<<(std::ostream& out, const KLVKey& key);
 
 // A key with a mask: a zero octet of the pattern, and octet 7 always, are
 // wildcards.
-class KLVKeyPattern {
+class ZELTA_EXPORT KLVKeyPattern {
 public:
   constexpr explicit KLVKeyPattern(const std::array<std::uint8_t, 16>& pattern)
       : pattern_(pattern), mask_(maskOf(pattern)) {}
@@ -128,7 +130,7 @@ private:
 };
 
 // 16 opaque octets: instance, generation and error identifiers.
-class MXFUID {
+class ZELTA_EXPORT MXFUID {
 public:
   constexpr MXFUID() : octets_{} {}
   constexpr explicit MXFUID(const std::array<std::uint8_t, 16>& octets) : octets_(octets) {}
@@ -148,21 +150,21 @@ private:
   std::array<std::uint8_t, 16> octets_;
 };
 
-class MXFUIDGenerator {
+class ZELTA_EXPORT MXFUIDGenerator {
 public:
   virtual ~MXFUIDGenerator();
   virtual MXFUID generate() = 0;
 };
 
 // Identifiers as uuid_generate makes them.
-class ZeltaDefaultUIDGenerator : public MXFUIDGenerator {
+class ZELTA_EXPORT ZeltaDefaultUIDGenerator : public MXFUIDGenerator {
 public:
   MXFUID generate() override;
 };
 
 // SMPTE 330M unique material identifier: kind 0 basic (32 octets) or 1
 // extended (64 octets).
-struct UMID {
+struct ZELTA_EXPORT UMID {
   enum Kind : std::uint8_t { basic = 0, extended = 1 };
 
   UMID();
@@ -179,14 +181,14 @@ struct UMID {
   bool operator!=(const UMID& o) const { return !(*this == o); }
 };
 
-struct MXFRational {
+struct ZELTA_EXPORT MXFRational {
   std::int32_t numerator = 0;
   std::int32_t denominator = 0;
   bool operator==(const MXFRational& o) const { return numerator == o.numerator && denominator == o.denominator; }
   bool operator!=(const MXFRational& o) const { return !(*this == o); }
 };
 
-struct MXFTimestamp {
+struct ZELTA_EXPORT MXFTimestamp {
   std::uint16_t year = 0;
   std::uint8_t month = 0;
   std::uint8_t day = 0;
@@ -198,7 +200,7 @@ struct MXFTimestamp {
   bool operator!=(const MXFTimestamp& o) const { return !(*this == o); }
 };
 
-struct MXFProductVersion {
+struct ZELTA_EXPORT MXFProductVersion {
   std::uint16_t major = 0;
   std::uint16_t minor = 0;
   std::uint16_t tertiary = 0;
@@ -209,7 +211,7 @@ struct MXFProductVersion {
 };
 
 // A 12-bit mantissa and a signed exponent from -8 to 7.
-struct Decimal16 {
+struct ZELTA_EXPORT Decimal16 {
   std::uint16_t mantissa = 0;
   std::int8_t exponent = 0;
   bool operator==(const Decimal16& o) const { return mantissa == o.mantissa && exponent == o.exponent; }
@@ -218,7 +220,7 @@ struct Decimal16 {
 
 // IEEE 754 half precision held apart; built from a float it saturates at
 // 65504 instead of becoming infinite.
-struct Binary16 {
+struct ZELTA_EXPORT Binary16 {
   Binary16() = default;
   explicit Binary16(float value);
   float toFloat() const;
@@ -236,13 +238,13 @@ struct Binary16 {
 // Failure reporting to the client
 
 // A stream position, -1 when unknown.
-class Locator {
+class ZELTA_EXPORT Locator {
 public:
   virtual ~Locator();
   virtual const std::streampos& getPosition() = 0;
 };
 
-class ErrorHandler {
+class ZELTA_EXPORT ErrorHandler {
 public:
   virtual ~ErrorHandler();
   virtual void setLocator(Locator* locator) = 0;
@@ -282,7 +284,7 @@ inline constexpr MXFUID fillItemKeyVersionId = ZeltaErrorId(0x4C, 0x4B, 0x00, 0x
 namespace util {
 
 // Read-only stream buffer over bytes it does not own.
-class vector_streambuf : public std::streambuf {
+class ZELTA_EXPORT vector_streambuf : public std::streambuf {
 public:
   vector_streambuf();
   explicit vector_streambuf(const ByteVector& bytes);
@@ -298,7 +300,7 @@ protected:
 };
 
 // Input stream over a byte vector, without copying.
-class vector_istream : public std::istream {
+class ZELTA_EXPORT vector_istream : public std::istream {
 public:
   explicit vector_istream(const ByteVector& bytes);
   vector_istream(const std::uint8_t* data, std::size_t size);
@@ -310,7 +312,7 @@ private:
 };
 
 // Boost.Iostreams sink that appends to a byte vector.
-class byte_vector_device {
+class ZELTA_EXPORT byte_vector_device {
 public:
   typedef char char_type;
   typedef boost::iostreams::sink_tag category;
@@ -328,22 +330,22 @@ private:
 
 namespace utf8 {
 
-class exception : public std::exception {
+class ZELTA_EXPORT exception : public std::exception {
 public:
   const char* what() const noexcept override;
 };
 
-class invalid_code_point : public exception {
+class ZELTA_EXPORT invalid_code_point : public exception {
 public:
   const char* what() const noexcept override;
 };
 
 // UTF-8 octets to code points; throws invalid_code_point on a sequence that
 // is no valid code point.
-std::wstring decode(const std::string& text);
+ZELTA_EXPORT std::wstring decode(const std::string& text);
 // Code points to UTF-8; throws invalid_code_point for a surrogate or a value
 // beyond U+10FFFF.
-std::string encode(const std::wstring& text);
+ZELTA_EXPORT std::string encode(const std::wstring& text);
 
 }  // namespace utf8
 
@@ -352,13 +354,13 @@ std::string encode(const std::wstring& text);
 namespace loomlib {
 
 // String streams that never depend on the process's locale.
-class istringstream_classic : public std::istringstream {
+class ZELTA_EXPORT istringstream_classic : public std::istringstream {
 public:
   istringstream_classic();
   explicit istringstream_classic(const std::string& text);
 };
 
-class ostringstream_classic : public std::ostringstream {
+class ZELTA_EXPORT ostringstream_classic : public std::ostringstream {
 public:
   ostringstream_classic();
 };
@@ -395,7 +397,7 @@ template <> struct external_size<Binary16> { static constexpr std::uint32_t valu
 
 // Exactly count octets ("successful get()"), from what the stream's buffer
 // holds when it holds them: values are read a few octets at a time.
-void getOctets(std::istream& in, std::uint8_t* octets, std::size_t count);
+ZELTA_EXPORT void getOctets(std::istream& in, std::uint8_t* octets, std::size_t count);
 
 inline std::uint8_t getOctet(std::istream& in) {
   std::uint8_t octet = 0;
@@ -435,19 +437,19 @@ inline void internalize(std::istream& in, std::uint32_t& v) { v = util::getBigEn
 inline void internalize(std::istream& in, std::int32_t& v) { v = util::getBigEndian<std::int32_t>(in); }
 inline void internalize(std::istream& in, std::uint64_t& v) { v = util::getBigEndian<std::uint64_t>(in); }
 inline void internalize(std::istream& in, std::int64_t& v) { v = util::getBigEndian<std::int64_t>(in); }
-void internalize(std::istream& in, MXFRational& v);
-void internalize(std::istream& in, MXFTimestamp& v);
-void internalize(std::istream& in, MXFProductVersion& v);
-void internalize(std::istream& in, KLVKey& v);
-void internalize(std::istream& in, MXFUID& v);
+ZELTA_EXPORT void internalize(std::istream& in, MXFRational& v);
+ZELTA_EXPORT void internalize(std::istream& in, MXFTimestamp& v);
+ZELTA_EXPORT void internalize(std::istream& in, MXFProductVersion& v);
+ZELTA_EXPORT void internalize(std::istream& in, KLVKey& v);
+ZELTA_EXPORT void internalize(std::istream& in, MXFUID& v);
 // 32 octets, and 32 more when the stream holds more: basic or extended.
-void internalize(std::istream& in, UMID& v);
-void internalize(std::istream& in, Decimal16& v);
-void internalize(std::istream& in, Binary16& v);
+ZELTA_EXPORT void internalize(std::istream& in, UMID& v);
+ZELTA_EXPORT void internalize(std::istream& in, Decimal16& v);
+ZELTA_EXPORT void internalize(std::istream& in, Binary16& v);
 // Big-endian UTF-16 to code points, surrogate pairs joined; reads to the end.
-void internalize(std::istream& in, std::wstring& v);
+ZELTA_EXPORT void internalize(std::istream& in, std::wstring& v);
 // Octets as they stand; reads to the end.
-void internalize(std::istream& in, std::string& v);
+ZELTA_EXPORT void internalize(std::istream& in, std::string& v);
 
 inline void externalize(std::ostream& out, std::uint8_t v) { util::putOctet(out, v); }
 inline void externalize(std::ostream& out, std::int8_t v) { util::putOctet(out, static_cast<std::uint8_t>(v)); }
@@ -458,16 +460,16 @@ inline void externalize(std::ostream& out, std::uint32_t v) { util::putBigEndian
 inline void externalize(std::ostream& out, std::int32_t v) { util::putBigEndian(out, v); }
 inline void externalize(std::ostream& out, std::uint64_t v) { util::putBigEndian(out, v); }
 inline void externalize(std::ostream& out, std::int64_t v) { util::putBigEndian(out, v); }
-void externalize(std::ostream& out, const MXFRational& v);
-void externalize(std::ostream& out, const MXFTimestamp& v);
-void externalize(std::ostream& out, const MXFProductVersion& v);
-void externalize(std::ostream& out, const KLVKey& v);
-void externalize(std::ostream& out, const MXFUID& v);
-void externalize(std::ostream& out, const UMID& v);
-void externalize(std::ostream& out, const Decimal16& v);
-void externalize(std::ostream& out, const Binary16& v);
-void externalize(std::ostream& out, const std::wstring& v);
-void externalize(std::ostream& out, const std::string& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const MXFRational& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const MXFTimestamp& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const MXFProductVersion& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const KLVKey& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const MXFUID& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const UMID& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const Decimal16& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const Binary16& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const std::wstring& v);
+ZELTA_EXPORT void externalize(std::ostream& out, const std::string& v);
 
 // A batch: uint32 count, uint32 item size, the items. Each item is read by
 // its own rule and then skipped to the declared item size.
@@ -517,15 +519,15 @@ void externalize(std::ostream& out, const std::vector<T>& items) {
 
 namespace util {
 // Requires an input stream to be used up.
-void requireExhausted(std::istream& in);
+ZELTA_EXPORT void requireExhausted(std::istream& in);
 // Requires the last write to have succeeded.
-void requireWritten(std::ostream& out);
+ZELTA_EXPORT void requireWritten(std::ostream& out);
 
 // The stream over a byte vector that internalize reads. Making a
 // std::istream looks up the locale's facets, which costs more than reading
 // most values: each thread keeps one stream and lends it out, and only an
 // internalize within another makes a stream of its own.
-class LentInput {
+class ZELTA_EXPORT LentInput {
 public:
   explicit LentInput(const ByteVector& bytes);
   LentInput(const LentInput&) = delete;
@@ -571,9 +573,9 @@ inline constexpr KLVLengthType KLVLengthType4 = 3;
 
 // Octets of a tag type ("valid tag type") and of a fixed length type ("valid
 // length type"); the label of a length type for messages.
-unsigned KLVTagTypeOctets(KLVTagType tagType);
-unsigned KLVFixedLengthTypeOctets(KLVLengthType lengthType);
-const char* KLVLengthTypeLabel(KLVLengthType lengthType);
+ZELTA_EXPORT unsigned KLVTagTypeOctets(KLVTagType tagType);
+ZELTA_EXPORT unsigned KLVFixedLengthTypeOctets(KLVLengthType lengthType);
+ZELTA_EXPORT const char* KLVLengthTypeLabel(KLVLengthType lengthType);
 
 // The BER form value that no stream ever has: the start of every current form.
 inline constexpr std::uint8_t KLVNoLengthForm = 0x80;
@@ -585,26 +587,26 @@ inline constexpr std::uint8_t KLVEightOctetLengthForm = 0x87;
 
 // Octets of a BER length of a form: 1 for short form, (form & 127) + 1 for
 // long form ("valid BER length form").
-unsigned lengthFormOctets(std::uint8_t form);
+ZELTA_EXPORT unsigned lengthFormOctets(std::uint8_t form);
 // The same for length type BER, the fixed size otherwise.
-unsigned lengthTypeOctets(KLVLengthType lengthType, std::uint8_t form);
+ZELTA_EXPORT unsigned lengthTypeOctets(KLVLengthType lengthType, std::uint8_t form);
 
 // Coding of a key by its octet 5. Each checks the key's family first ("valid
 // local set key", "valid variable length pack key", "valid wrapper key") and
 // answers false for an octet 5 that the coding does not allow.
-bool KLVLocalSetCoding(const KLVKey& key, KLVTagType& tagType, KLVLengthType& lengthType);
-bool KLVVariableLengthPackCoding(const KLVKey& key, KLVLengthType& lengthType);
-bool KLVWrapperCoding(const KLVKey& key, bool& isWrapper);
+ZELTA_EXPORT bool KLVLocalSetCoding(const KLVKey& key, KLVTagType& tagType, KLVLengthType& lengthType);
+ZELTA_EXPORT bool KLVVariableLengthPackCoding(const KLVKey& key, KLVLengthType& lengthType);
+ZELTA_EXPORT bool KLVWrapperCoding(const KLVKey& key, bool& isWrapper);
 
 inline constexpr KLVKey KLVFillItemKey{
     std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, 0x01, 0x03, 0x01, 0x02, 0x10, 0x01, 0x00,
                                  0x00, 0x00}};
 
 // The fill item key version, a stream attribute; 0 is unset.
-void setFillItemKeyVersion(std::ios_base& stream, std::uint8_t version);
-std::uint8_t getFillItemKeyVersion(std::ios_base& stream);
+ZELTA_EXPORT void setFillItemKeyVersion(std::ios_base& stream, std::uint8_t version);
+ZELTA_EXPORT std::uint8_t getFillItemKeyVersion(std::ios_base& stream);
 
-class KLVHandler {
+class ZELTA_EXPORT KLVHandler {
 public:
   virtual ~KLVHandler();
   virtual void setLocator(Locator* locator) = 0;
@@ -634,7 +636,7 @@ public:
 };
 
 // Ignores every event and declines every value.
-class DullKLVHandler : public KLVHandler {
+class ZELTA_EXPORT DullKLVHandler : public KLVHandler {
 public:
   void setLocator(Locator* locator) override;
   void startStream(bool hasAccurateLengths) override;
@@ -662,14 +664,14 @@ public:
   void value(const std::uint8_t* data, std::streamsize size) override;
 };
 
-class KLVFilter : public KLVHandler {
+class ZELTA_EXPORT KLVFilter : public KLVHandler {
 public:
   virtual void setHandler(KLVHandler* handler) = 0;
   virtual KLVHandler* getHandler() const = 0;
 };
 
 // Passes every event on unchanged to the next handler ("handler is present").
-class DullKLVFilter : public KLVFilter {
+class ZELTA_EXPORT DullKLVFilter : public KLVFilter {
 public:
   DullKLVFilter();
   explicit DullKLVFilter(KLVHandler* handler);
@@ -715,7 +717,7 @@ private:
 // Locators
 
 // A position that stays at zero.
-class NullLocator : public Locator {
+class ZELTA_EXPORT NullLocator : public Locator {
 public:
   const std::streampos& getPosition() override;
 
@@ -724,7 +726,7 @@ private:
 };
 
 // A position that its owner refreshes from a stream.
-class InputLocator : public Locator {
+class ZELTA_EXPORT InputLocator : public Locator {
 public:
   const std::streampos& getPosition() override;
   void setPosition(const std::streampos& position) { position_ = position; }
@@ -740,7 +742,7 @@ private:
 // octets of the key and length before a value, of the tag and length before
 // an item, and the length of a value that the handler declined, which the
 // position passes at the element's end.
-class KLVPrefixCount {
+class ZELTA_EXPORT KLVPrefixCount {
 public:
   static constexpr std::streamoff keyOctets = 16;
 
@@ -780,7 +782,7 @@ private:
 // the key and length or the tag and length, each value past its octets, and
 // each end past a value that the handler declined; how a move is made is the
 // subclass's.
-class KLVCountingFilter : public DullKLVFilter {
+class ZELTA_EXPORT KLVCountingFilter : public DullKLVFilter {
 public:
   explicit KLVCountingFilter(KLVHandler* handler) : DullKLVFilter(handler) {}
 
@@ -816,7 +818,7 @@ protected:
 // Takes the position from the input stream at the ends of a stream and counts
 // it from the coding at the events between; the position at a start event is
 // the first octet of the value.
-class KLVTeller : public KLVCountingFilter {
+class ZELTA_EXPORT KLVTeller : public KLVCountingFilter {
 public:
   KLVTeller(std::istream& stream, KLVHandler* handler = nullptr);
   Locator* getLocator();
@@ -838,7 +840,7 @@ private:
 };
 
 // Computes the position from the events alone, for pipes and output chains.
-class KLVMonitor : public KLVCountingFilter {
+class ZELTA_EXPORT KLVMonitor : public KLVCountingFilter {
 public:
   class MonitoredLocator : public Locator {
   public:
@@ -870,7 +872,7 @@ private:
 
 // Warns once per stream of a fill item key whose version octet is not the
 // stream's, or not 1 or 2 when the stream has none.
-class KLVFillItemKeyFilter : public DullKLVFilter {
+class ZELTA_EXPORT KLVFillItemKeyFilter : public DullKLVFilter {
 public:
   KLVFillItemKeyFilter(KLVHandler* handler, std::uint8_t fillItemKeyVersion, ErrorHandler* errorHandler);
 
@@ -888,7 +890,7 @@ private:
 // ---------------------------------------------------------------------------
 // Reading
 
-class KLVElement {
+class ZELTA_EXPORT KLVElement {
 public:
   // A fault of the data or the stream, with its identifier.
   class parse_error : public std::runtime_error {
@@ -922,7 +924,7 @@ protected:
   bool seekable_;
 };
 
-class KLVReader {
+class ZELTA_EXPORT KLVReader {
 public:
   virtual ~KLVReader();
   virtual void setHandler(KLVHandler* handler) = 0;
@@ -939,7 +941,7 @@ public:
 // by position: while read runs, the stream reads through a buffer of the
 // reader's, which is what rdbuf() answers then; when read returns, the
 // stream has its own buffer back and stands where the read stopped.
-class GenericKLVReader : public KLVReader {
+class ZELTA_EXPORT GenericKLVReader : public KLVReader {
 public:
   GenericKLVReader();
   void setHandler(KLVHandler* handler) override;
@@ -959,7 +961,7 @@ private:
 
 // Turns KLV events back into octets. Its start events take every value by
 // `value` events; the producer chooses the BER form by setLengthForm.
-class GenericKLVWriter : public KLVHandler {
+class ZELTA_EXPORT GenericKLVWriter : public KLVHandler {
 public:
   explicit GenericKLVWriter(std::ostream& stream);
 
@@ -1010,7 +1012,7 @@ private:
 };
 
 // Calls beforeEvent, the next handler and afterEvent around every event.
-class ActionKLVFilter : public DullKLVFilter {
+class ZELTA_EXPORT ActionKLVFilter : public DullKLVFilter {
 public:
   using DullKLVFilter::DullKLVFilter;
   virtual void beforeEvent() = 0;
@@ -1043,7 +1045,7 @@ public:
 };
 
 // Forwards every event to what getHandler answers at that moment.
-class KLVForwarder : public KLVHandler {
+class ZELTA_EXPORT KLVForwarder : public KLVHandler {
 public:
   void setLocator(Locator* locator) override;
   void startStream(bool hasAccurateLengths) override;
@@ -1074,19 +1076,20 @@ public:
 };
 
 // Producers' helpers that drive any handler.
-void writeIndividualItem(KLVHandler& handler, const KLVKey& key, const std::uint8_t* data, std::uint64_t length);
-void writeFixedLengthPack(KLVHandler& handler, const KLVKey& key, const ByteVector& bytes);
+ZELTA_EXPORT void writeIndividualItem(KLVHandler& handler, const KLVKey& key, const std::uint8_t* data,
+                                      std::uint64_t length);
+ZELTA_EXPORT void writeFixedLengthPack(KLVHandler& handler, const KLVKey& key, const ByteVector& bytes);
 typedef std::vector<std::pair<std::uint32_t, ByteVector>> KLVLocalItems;
-void writeLocalSet(KLVHandler& handler, const KLVKey& key, const KLVLocalItems& items, std::uint8_t form);
+ZELTA_EXPORT void writeLocalSet(KLVHandler& handler, const KLVKey& key, const KLVLocalItems& items, std::uint8_t form);
 // A fill item of value length `length` under the form.
-void writeFillItem(KLVHandler& handler, std::uint64_t length, std::uint8_t form);
+ZELTA_EXPORT void writeFillItem(KLVHandler& handler, std::uint64_t length, std::uint8_t form);
 
 // ---------------------------------------------------------------------------
 // Padding, stream joining and verification
 
 // Pads what passes between startFilledItem and endFilledItem to alignment
 // (mode 0) or to an exact length (mode 1) with one fill item.
-class KLVFiller : public DullKLVFilter {
+class ZELTA_EXPORT KLVFiller : public DullKLVFilter {
 public:
   enum FillMode { alignmentMode = 0, exactLengthMode = 1 };
 
@@ -1115,7 +1118,7 @@ private:
 };
 
 // Pads a whole stream: the fill comes last in it.
-class KLVStreamPadder : public KLVFiller {
+class ZELTA_EXPORT KLVStreamPadder : public KLVFiller {
 public:
   using KLVFiller::KLVFiller;
   void startStream(bool hasAccurateLengths) override;
@@ -1124,7 +1127,7 @@ public:
 
 // Hides stream boundaries, so that producers can write in turn into one
 // continuing stream.
-class KLVStreamFilter : public DullKLVFilter {
+class ZELTA_EXPORT KLVStreamFilter : public DullKLVFilter {
 public:
   using DullKLVFilter::DullKLVFilter;
   void setLocator(Locator* locator) override;
@@ -1135,7 +1138,7 @@ public:
 // Compares the keys and lengths of a producer's events with a stream that
 // already holds them; throws VerifyingKLVHandler::exception at the first
 // difference.
-class VerifyingKLVHandler : public KLVHandler {
+class ZELTA_EXPORT VerifyingKLVHandler : public KLVHandler {
 public:
   class exception : public std::runtime_error {
   public:
@@ -1179,7 +1182,7 @@ private:
 
 // Moves the stream to the next 06 0E 2B 34 within limit octets (-1: no
 // limit); false at the end of the stream or past the limit.
-bool findKey(std::istream& stream, std::streamoff limit);
+ZELTA_EXPORT bool findKey(std::istream& stream, std::streamoff limit);
 
 // ---------------------------------------------------------------------------
 // Timecode
@@ -1188,7 +1191,7 @@ bool findKey(std::istream& stream, std::streamoff limit);
 // field when a frame counts two units. Failures are std::runtime_error, and
 // std::logic_error for the guard of normalize.
 
-class TimecodeCalculator {
+class ZELTA_EXPORT TimecodeCalculator {
 public:
   virtual ~TimecodeCalculator();
   // The field output is skipped when null.
@@ -1206,7 +1209,7 @@ public:
 };
 
 // Every frame number exists. unitsPerFrame 0 means 1.
-class RegularTimecodeCalculator : public TimecodeCalculator {
+class ZELTA_EXPORT RegularTimecodeCalculator : public TimecodeCalculator {
 public:
   RegularTimecodeCalculator(std::uint8_t rate, std::uint8_t unitsPerFrame);
 
@@ -1231,7 +1234,7 @@ private:
 
 // NTSC drop frame counting: the first d frame numbers of every minute but
 // each tenth do not exist, d being 2 at base 30 and 4 at base 60.
-class NTSCDropFrameCalculator : public TimecodeCalculator {
+class ZELTA_EXPORT NTSCDropFrameCalculator : public TimecodeCalculator {
 public:
   NTSCDropFrameCalculator(std::uint8_t rate, std::uint8_t unitsPerFrame);
 
@@ -1259,11 +1262,12 @@ private:
 
 // The caller owns the result. Drop frame needs a multiple of 30 ("valid drop
 // frame rate"); unitsPerFrame 0 means 1.
-TimecodeCalculator* createTimecodeCalculator(std::uint8_t rate, bool dropFrame, std::uint8_t unitsPerFrame);
+ZELTA_EXPORT TimecodeCalculator* createTimecodeCalculator(std::uint8_t rate, bool dropFrame,
+                                                          std::uint8_t unitsPerFrame);
 // Two units a frame when fieldCounting is true.
-TimecodeCalculator* createTimecodeCalculator(std::uint8_t rate, bool dropFrame, bool fieldCounting);
+ZELTA_EXPORT TimecodeCalculator* createTimecodeCalculator(std::uint8_t rate, bool dropFrame, bool fieldCounting);
 // A rational frame rate: only multiples of 30000/1001 drop frames.
-TimecodeCalculator* createTimecodeCalculator(int numerator, int denominator);
+ZELTA_EXPORT TimecodeCalculator* createTimecodeCalculator(int numerator, int denominator);
 
 // ---------------------------------------------------------------------------
 // File device
@@ -1274,7 +1278,7 @@ namespace zelta {
 // size suited to the storage and read-ahead hints. Copies share one open
 // file. Every failure is a std::ios_base::failure whose what() is the bare
 // text ("not open", "bad read", ...).
-class file_device {
+class ZELTA_EXPORT file_device {
 public:
   typedef char char_type;
   struct category : boost::iostreams::seekable_device_tag,

@@ -21,7 +21,7 @@
 // The base of every object of a model. Ownership makes the model a tree: an
 // owning property holds its child strongly, the child links back weakly to
 // its single owner, and no object can come to own its own top owner.
-class MetadataRoot : public std::enable_shared_from_this<MetadataRoot> {
+class ZELTA_EXPORT MetadataRoot : public std::enable_shared_from_this<MetadataRoot> {
 public:
   // A dark property is either octets as they stand or an owned object.
   typedef std::variant<ByteVector, std::shared_ptr<MetadataRoot>> DarkValue;
@@ -100,7 +100,7 @@ std::shared_ptr<T> MetadataRoot::getDarkProperty(const KLVKey& key) const {
 
 // The base of the structural classes: adds the optional generation
 // identifier.
-class MetadataObject : public MetadataRoot {
+class ZELTA_EXPORT MetadataObject : public MetadataRoot {
 public:
   MetadataObject();
   ~MetadataObject() override;
@@ -123,7 +123,7 @@ private:
 // parser keeps them under the target's identifier and resolves each when
 // the target comes.
 
-class dangling_ref_base {
+class ZELTA_EXPORT dangling_ref_base {
 public:
   virtual ~dangling_ref_base();
   virtual bool isStrong() = 0;
@@ -132,7 +132,7 @@ public:
 
 // A single-valued property, set through the owner's setter.
 template <typename Owner, typename Value>
-class dangling_ref_t : public dangling_ref_base {
+class ZELTA_EXPORT dangling_ref_t : public dangling_ref_base {
 public:
   typedef void (Owner::*setter_type)(const std::shared_ptr<Value>&);
 
@@ -156,7 +156,7 @@ private:
 // it that are in already, so that the vector keeps the order of the
 // identifiers whatever the order in which the targets arrive.
 template <typename Owner, typename Value>
-class dangling_vector_ref_t : public dangling_ref_base {
+class ZELTA_EXPORT dangling_vector_ref_t : public dangling_ref_base {
 public:
   typedef void (Owner::*inserter_type)(std::size_t, const std::shared_ptr<Value>&);
 
@@ -192,7 +192,7 @@ private:
 // A dark property declared to be a reference: the object replaces the
 // identifier octets under the key. Always strong.
 template <typename Owner>
-class dangling_dark_ref_t : public dangling_ref_base {
+class ZELTA_EXPORT dangling_dark_ref_t : public dangling_ref_base {
 public:
   dangling_dark_ref_t(const std::shared_ptr<Owner>& owner, const KLVKey& key) : owner_(owner), key_(key) {}
 
@@ -243,12 +243,12 @@ typedef std::multimap<MXFUID, std::shared_ptr<dangling_ref_base>> MXFPendingRefe
 typedef std::list<std::shared_ptr<const MetadataRoot>> MXFReferencedObjects;
 typedef std::vector<std::shared_ptr<MetadataRoot>> MXFMetadataModel;
 
-struct MXFParsedObject {
+struct ZELTA_EXPORT MXFParsedObject {
   std::shared_ptr<MetadataRoot> object;
   MXFPendingReferences references;
 };
 
-struct MXFCodedObject {
+struct ZELTA_EXPORT MXFCodedObject {
   MXFPrimedSet set;
   MXFReferencedObjects referenced;
 };
@@ -258,7 +258,7 @@ struct MXFCodedObject {
 struct MXFPropertyDescription;
 typedef std::map<KLVKey, MXFPropertyDescription> MXFPropertyDescriptions;
 
-class MXFMetadataFactory {
+class ZELTA_EXPORT MXFMetadataFactory {
 public:
   virtual ~MXFMetadataFactory();
   virtual void setErrorHandler(const std::shared_ptr<ErrorHandler>& errorHandler) = 0;
@@ -275,7 +275,7 @@ public:
 // factory; each constructor adds its class's own properties to the set
 // primer, which thus holds the whole class chain. A tag of 0 there means
 // that the key gets a dynamic tag when coded.
-class MetadataRootFactory : public MXFMetadataFactory {
+class ZELTA_EXPORT MetadataRootFactory : public MXFMetadataFactory {
 public:
   MetadataRootFactory();
   ~MetadataRootFactory() override;
@@ -335,7 +335,7 @@ private:
 // SegmentFactory> {}. The constructor enters the class's own properties
 // into the set primer, behind those of Base.
 template <typename C, typename Base>
-class MetadataClassFactory : public Base {
+class ZELTA_EXPORT MetadataClassFactory : public Base {
 public:
   MetadataClassFactory();
   ~MetadataClassFactory() override;
@@ -353,7 +353,7 @@ class MetadataObjectFactory : public MetadataClassFactory<MetadataObject, Metada
 
 // A composite: asks its sub-factories in order and remembers who answered,
 // by set key and by type.
-class MXFMetadataModelFactory : public MXFMetadataFactory {
+class ZELTA_EXPORT MXFMetadataModelFactory : public MXFMetadataFactory {
 public:
   typedef std::vector<std::shared_ptr<MXFMetadataFactory>> Factories;
 
@@ -386,7 +386,7 @@ private:
 };
 
 // Whole models: the root first, then objects that nothing owns.
-class MXFMetadataModelHandler {
+class ZELTA_EXPORT MXFMetadataModelHandler {
 public:
   virtual ~MXFMetadataModelHandler();
   virtual void start() = 0;
@@ -396,7 +396,7 @@ public:
 
 // Makes objects of primed sets and connects them in one sweep, each
 // reference as soon as both ends are there.
-class MXFMetadataModelParser : public MXFMetadataHandler {
+class ZELTA_EXPORT MXFMetadataModelParser : public MXFMetadataHandler {
 public:
   MXFMetadataModelParser(MXFMetadataModelHandler* handler, const std::shared_ptr<MXFMetadataFactory>& factory);
   MXFMetadataModelParser(const MXFMetadataModelParser&) = delete;
@@ -423,7 +423,7 @@ private:
 
 // Walks a model depth-first into a primer and primed sets: static tags from
 // the classes, dynamic ones from 0x8000 for the rest.
-class MXFMetadataModelCoder : public MXFMetadataModelHandler {
+class ZELTA_EXPORT MXFMetadataModelCoder : public MXFMetadataModelHandler {
 public:
   MXFMetadataModelCoder(MXFMetadataHandler* handler, const std::shared_ptr<MXFMetadataFactory>& factory);
 
@@ -456,7 +456,7 @@ class SourceReference;
 class DescriptiveMetadataFramework;
 class GenericDescriptor;
 
-class Preface : public MetadataObject {
+class ZELTA_EXPORT Preface : public MetadataObject {
 public:
   // lastModifiedDate the present UTC time, version 0x0102.
   Preface();
@@ -511,7 +511,7 @@ private:
   std::vector<KLVKey> dmSchemes_;
 };
 
-class Identification : public MetadataObject {
+class ZELTA_EXPORT Identification : public MetadataObject {
 public:
   // thisGenerationUID from uuid_generate, modificationDate the present UTC
   // time.
@@ -557,7 +557,7 @@ private:
   std::optional<std::wstring> platform_;
 };
 
-class ContentStorage : public MetadataObject {
+class ZELTA_EXPORT ContentStorage : public MetadataObject {
 public:
   ContentStorage();
   ~ContentStorage() override;
@@ -588,7 +588,7 @@ private:
   bool hasEssenceContainerData_ = false;
 };
 
-class EssenceContainerData : public MetadataObject {
+class ZELTA_EXPORT EssenceContainerData : public MetadataObject {
 public:
   EssenceContainerData();
   ~EssenceContainerData() override;
@@ -611,7 +611,7 @@ private:
   std::uint32_t bodySID_ = 0;
 };
 
-class GenericPackage : public MetadataObject {
+class ZELTA_EXPORT GenericPackage : public MetadataObject {
 public:
   // Both dates the present UTC time, and a new packageUID.
   GenericPackage();
@@ -645,7 +645,7 @@ private:
   std::vector<std::shared_ptr<Track>> tracks_;
 };
 
-class MaterialPackage : public GenericPackage {
+class ZELTA_EXPORT MaterialPackage : public GenericPackage {
 public:
   MaterialPackage();
   ~MaterialPackage() override;
@@ -653,7 +653,7 @@ public:
   static std::shared_ptr<MaterialPackage> create();
 };
 
-class SourcePackage : public GenericPackage {
+class ZELTA_EXPORT SourcePackage : public GenericPackage {
 public:
   SourcePackage();
   ~SourcePackage() override;
@@ -668,7 +668,7 @@ private:
   std::shared_ptr<GenericDescriptor> descriptor_;
 };
 
-class Track : public MetadataObject {
+class ZELTA_EXPORT Track : public MetadataObject {
 public:
   Track();
   ~Track() override;
@@ -697,7 +697,7 @@ private:
   std::shared_ptr<Segment> segment_;
 };
 
-class TimelineTrack : public Track {
+class ZELTA_EXPORT TimelineTrack : public Track {
 public:
   TimelineTrack();
   ~TimelineTrack() override;
@@ -714,7 +714,7 @@ private:
   std::int64_t origin_ = 0;
 };
 
-class EventTrack : public Track {
+class ZELTA_EXPORT EventTrack : public Track {
 public:
   EventTrack();
   ~EventTrack() override;
@@ -733,7 +733,7 @@ private:
   std::optional<std::int64_t> origin_;
 };
 
-class StaticTrack : public Track {
+class ZELTA_EXPORT StaticTrack : public Track {
 public:
   StaticTrack();
   ~StaticTrack() override;
@@ -741,7 +741,7 @@ public:
   static std::shared_ptr<StaticTrack> create();
 };
 
-class Component : public MetadataObject {
+class ZELTA_EXPORT Component : public MetadataObject {
 public:
   Component();
   ~Component() override;
@@ -760,7 +760,7 @@ private:
   std::optional<std::int64_t> duration_;
 };
 
-class Segment : public Component {
+class ZELTA_EXPORT Segment : public Component {
 public:
   Segment();
   ~Segment() override;
@@ -768,7 +768,7 @@ public:
   static std::shared_ptr<Segment> create();
 };
 
-class Sequence : public Segment {
+class ZELTA_EXPORT Sequence : public Segment {
 public:
   Sequence();
   ~Sequence() override;
@@ -786,7 +786,7 @@ private:
   std::vector<std::shared_ptr<Component>> components_;
 };
 
-class SourceReference : public Segment {
+class ZELTA_EXPORT SourceReference : public Segment {
 public:
   SourceReference();
   ~SourceReference() override;
@@ -804,7 +804,7 @@ private:
   std::uint32_t sourceTrackID_ = 0;
 };
 
-class SourceClip : public SourceReference {
+class ZELTA_EXPORT SourceClip : public SourceReference {
 public:
   SourceClip();
   ~SourceClip() override;
@@ -818,7 +818,7 @@ private:
   std::int64_t startPosition_ = 0;
 };
 
-class DMSourceClip : public SourceClip {
+class ZELTA_EXPORT DMSourceClip : public SourceClip {
 public:
   DMSourceClip();
   ~DMSourceClip() override;
@@ -834,7 +834,7 @@ private:
   std::optional<std::vector<std::uint32_t>> targetTrackIDs_;
 };
 
-class TimecodeComponent : public Segment {
+class ZELTA_EXPORT TimecodeComponent : public Segment {
 public:
   TimecodeComponent();
   ~TimecodeComponent() override;
@@ -854,7 +854,7 @@ private:
   bool dropFrame_ = false;
 };
 
-class Event : public Segment {
+class ZELTA_EXPORT Event : public Segment {
 public:
   Event();
   ~Event() override;
@@ -875,7 +875,7 @@ private:
   std::optional<std::wstring> comment_;
 };
 
-class CommentMarker : public Event {
+class ZELTA_EXPORT CommentMarker : public Event {
 public:
   CommentMarker();
   ~CommentMarker() override;
@@ -893,7 +893,7 @@ private:
   std::shared_ptr<SourceReference> annotation_;
 };
 
-class DMSegment : public CommentMarker {
+class ZELTA_EXPORT DMSegment : public CommentMarker {
 public:
   DMSegment();
   ~DMSegment() override;
@@ -918,7 +918,7 @@ private:
 };
 
 // The bases of the descriptive metadata schemes.
-class DescriptiveMetadataFramework : public MetadataObject {
+class ZELTA_EXPORT DescriptiveMetadataFramework : public MetadataObject {
 public:
   DescriptiveMetadataFramework();
   ~DescriptiveMetadataFramework() override;
@@ -926,7 +926,7 @@ public:
   static std::shared_ptr<DescriptiveMetadataFramework> create();
 };
 
-class DescriptiveMetadataObject : public MetadataObject {
+class ZELTA_EXPORT DescriptiveMetadataObject : public MetadataObject {
 public:
   DescriptiveMetadataObject();
   ~DescriptiveMetadataObject() override;
@@ -966,7 +966,7 @@ class DescriptiveMetadataObjectFactory
 // Locators and descriptors
 
 // Where essence outside the file is to be found.
-class GenericLocator : public MetadataObject {
+class ZELTA_EXPORT GenericLocator : public MetadataObject {
 public:
   GenericLocator();
   ~GenericLocator() override;
@@ -974,7 +974,7 @@ public:
   static std::shared_ptr<GenericLocator> create();
 };
 
-class NetworkLocator : public GenericLocator {
+class ZELTA_EXPORT NetworkLocator : public GenericLocator {
 public:
   NetworkLocator();
   ~NetworkLocator() override;
@@ -988,7 +988,7 @@ private:
   std::wstring urlString_;
 };
 
-class TextLocator : public GenericLocator {
+class ZELTA_EXPORT TextLocator : public GenericLocator {
 public:
   TextLocator();
   ~TextLocator() override;
@@ -1008,7 +1008,7 @@ class TextLocatorFactory : public MetadataClassFactory<TextLocator, GenericLocat
 
 // Eight pairs of a component code and its depth in bits, kept as they stand
 // in the file: exactly 16 octets.
-struct RGBALayout {
+struct ZELTA_EXPORT RGBALayout {
   struct Component {
     std::uint8_t code = 0;
     std::uint8_t depth = 0;
@@ -1022,7 +1022,7 @@ struct RGBALayout {
 };
 
 // A further description that hangs under a descriptor.
-class SubDescriptor : public MetadataObject {
+class ZELTA_EXPORT SubDescriptor : public MetadataObject {
 public:
   SubDescriptor();
   ~SubDescriptor() override;
@@ -1030,7 +1030,7 @@ public:
   static std::shared_ptr<SubDescriptor> create();
 };
 
-class ContainerConstraintsSubDescriptor : public SubDescriptor {
+class ZELTA_EXPORT ContainerConstraintsSubDescriptor : public SubDescriptor {
 public:
   ContainerConstraintsSubDescriptor();
   ~ContainerConstraintsSubDescriptor() override;
@@ -1040,7 +1040,7 @@ public:
 
 // The base of the essence descriptors: locators and sub-descriptors, both
 // optional vectors that the descriptor owns.
-class GenericDescriptor : public MetadataObject {
+class ZELTA_EXPORT GenericDescriptor : public MetadataObject {
 public:
   GenericDescriptor();
   ~GenericDescriptor() override;
@@ -1081,7 +1081,7 @@ private:
   bool hasGenericSubDescriptors_ = false;
 };
 
-class FileDescriptor : public GenericDescriptor {
+class ZELTA_EXPORT FileDescriptor : public GenericDescriptor {
 public:
   FileDescriptor();
   ~FileDescriptor() override;
@@ -1117,7 +1117,7 @@ private:
   std::optional<MXFUID> codec_;
 };
 
-class PictureDescriptor : public FileDescriptor {
+class ZELTA_EXPORT PictureDescriptor : public FileDescriptor {
 public:
   PictureDescriptor();
   ~PictureDescriptor() override;
@@ -1278,7 +1278,7 @@ private:
 };
 
 // Colour difference component pictures.
-class CDCIPictureDescriptor : public PictureDescriptor {
+class ZELTA_EXPORT CDCIPictureDescriptor : public PictureDescriptor {
 public:
   CDCIPictureDescriptor();
   ~CDCIPictureDescriptor() override;
@@ -1347,7 +1347,7 @@ private:
 };
 
 // Component pictures, red, green, blue and alpha.
-class RGBAPictureDescriptor : public PictureDescriptor {
+class ZELTA_EXPORT RGBAPictureDescriptor : public PictureDescriptor {
 public:
   RGBAPictureDescriptor();
   ~RGBAPictureDescriptor() override;
@@ -1403,7 +1403,7 @@ private:
   std::optional<RGBALayout> paletteLayout_;
 };
 
-class SoundDescriptor : public FileDescriptor {
+class ZELTA_EXPORT SoundDescriptor : public FileDescriptor {
 public:
   // The audio sampling rate starts at 0/1.
   SoundDescriptor();
@@ -1454,7 +1454,7 @@ private:
   std::optional<KLVKey> soundEssenceCompression_;
 };
 
-class DataDescriptor : public FileDescriptor {
+class ZELTA_EXPORT DataDescriptor : public FileDescriptor {
 public:
   DataDescriptor();
   ~DataDescriptor() override;
@@ -1472,7 +1472,7 @@ private:
 
 // The descriptor of a container that interleaves several essences: one
 // file descriptor for each.
-class MultipleDescriptor : public FileDescriptor {
+class ZELTA_EXPORT MultipleDescriptor : public FileDescriptor {
 public:
   MultipleDescriptor();
   ~MultipleDescriptor() override;
@@ -1507,9 +1507,9 @@ class MultipleDescriptorFactory : public MetadataClassFactory<MultipleDescriptor
 // a wrapping (octet 15); the Preface version decides the colour siting of
 // 625-line pictures. A D-10 label names a kind (octet 14) and a wrapping
 // (octet 15). Both fail on a label that they can't describe.
-std::shared_ptr<CDCIPictureDescriptor> createDVPictureDescriptor(const KLVKey& essenceContainer,
+ZELTA_EXPORT std::shared_ptr<CDCIPictureDescriptor> createDVPictureDescriptor(const KLVKey& essenceContainer,
                                                                  std::uint16_t prefaceVersion);
-std::shared_ptr<CDCIPictureDescriptor> createD10PictureDescriptor(const KLVKey& essenceContainer);
+ZELTA_EXPORT std::shared_ptr<CDCIPictureDescriptor> createD10PictureDescriptor(const KLVKey& essenceContainer);
 
 // ---------------------------------------------------------------------------
 // The composite of the format's classes
@@ -1517,7 +1517,7 @@ std::shared_ptr<CDCIPictureDescriptor> createD10PictureDescriptor(const KLVKey& 
 // Every class of the format that a file may hold as a set, in search order:
 // the structural classes, the locators and the descriptors. Sets of other
 // classes are dark to it.
-class MXFFormatMetadataModelFactory : public MXFMetadataModelFactory {
+class ZELTA_EXPORT MXFFormatMetadataModelFactory : public MXFMetadataModelFactory {
 public:
   MXFFormatMetadataModelFactory();
   ~MXFFormatMetadataModelFactory() override;
@@ -1565,7 +1565,7 @@ enum class MXFPropertyKind {
   opaque
 };
 
-struct MXFPropertyDescription {
+struct ZELTA_EXPORT MXFPropertyDescription {
   std::string name;  // class, point, property: "Track.trackID"
   MXFPropertyKind kind;
 };

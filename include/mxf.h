@@ -30,7 +30,7 @@ inline constexpr MXFUID partitionVersionRangeId = ZeltaErrorId(0x4C, 0x4C, 0x02,
 // ---------------------------------------------------------------------------
 // Partition and random index packs
 
-struct MXFPartitionPack {
+struct ZELTA_EXPORT MXFPartitionPack {
   std::uint16_t majorVersion = 1;
   std::uint16_t minorVersion = 2;
   std::uint32_t kagSize = 0;
@@ -49,10 +49,10 @@ struct MXFPartitionPack {
   bool operator!=(const MXFPartitionPack& o) const { return !(*this == o); }
 };
 
-void internalize(std::istream& in, MXFPartitionPack& pack);
-void externalize(std::ostream& out, const MXFPartitionPack& pack);
+ZELTA_EXPORT void internalize(std::istream& in, MXFPartitionPack& pack);
+ZELTA_EXPORT void externalize(std::ostream& out, const MXFPartitionPack& pack);
 
-struct MXFRandomIndexEntry {
+struct ZELTA_EXPORT MXFRandomIndexEntry {
   std::uint32_t bodySID = 0;
   std::uint64_t byteOffset = 0;
 
@@ -65,8 +65,8 @@ struct MXFRandomIndexEntry {
 // The value of a random index pack: 12-octet entries, then the overall
 // length of the pack, checked against the BER form unless form is 0
 // ("correct overall length").
-void internalize(const ByteVector& bytes, std::vector<MXFRandomIndexEntry>& entries, std::uint8_t form);
-void externalize(ByteVector& bytes, const std::vector<MXFRandomIndexEntry>& entries, std::uint8_t form);
+ZELTA_EXPORT void internalize(const ByteVector& bytes, std::vector<MXFRandomIndexEntry>& entries, std::uint8_t form);
+ZELTA_EXPORT void externalize(ByteVector& bytes, const std::vector<MXFRandomIndexEntry>& entries, std::uint8_t form);
 
 // Partition kinds (key octet 13) and statuses (key octet 14).
 enum MXFPartitionKind : std::uint8_t { MXFHeaderPartition = 2, MXFBodyPartition = 3, MXFFooterPartition = 4 };
@@ -77,21 +77,21 @@ enum MXFPartitionStatus : std::uint8_t {
   MXFClosedComplete = 4
 };
 
-KLVKey MXFPartitionPackKey(MXFPartitionKind kind, MXFPartitionStatus status);
+ZELTA_EXPORT KLVKey MXFPartitionPackKey(MXFPartitionKind kind, MXFPartitionStatus status);
 inline constexpr KLVKey MXFRandomIndexPackKey{
     std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x02, 0x05, 0x01, 0x01, 0x0D, 0x01, 0x02, 0x01, 0x01, 0x11,
                                  0x01, 0x00}};
 
-bool isMXFPartitionKey(const KLVKey& key);
-bool isMXFRandomIndexKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFPartitionKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFRandomIndexKey(const KLVKey& key);
 // Of a partition key: its kind and its status.
-MXFPartitionKind getMXFPartitionKind(const KLVKey& key);
-MXFPartitionStatus getMXFPartitionStatus(const KLVKey& key);
+ZELTA_EXPORT MXFPartitionKind getMXFPartitionKind(const KLVKey& key);
+ZELTA_EXPORT MXFPartitionStatus getMXFPartitionStatus(const KLVKey& key);
 
 // ---------------------------------------------------------------------------
 // Structure events
 
-class MXFStructureHandler {
+class ZELTA_EXPORT MXFStructureHandler {
 public:
   virtual ~MXFStructureHandler();
   virtual void setRunIn(std::uint32_t runIn) = 0;
@@ -104,7 +104,7 @@ public:
   virtual void randomIndex(const std::vector<MXFRandomIndexEntry>& entries) = 0;
 };
 
-class DullMXFStructureHandler : public MXFStructureHandler {
+class ZELTA_EXPORT DullMXFStructureHandler : public MXFStructureHandler {
 public:
   void setRunIn(std::uint32_t runIn) override;
   void startStream() override;
@@ -117,7 +117,7 @@ public:
 // Cuts a KLV stream into partitions by the byte counts of their packs, and
 // each partition into header metadata, index and essence sections, each a
 // complete KLV stream to its delegate.
-class MXFSplitter : public KLVHandler {
+class ZELTA_EXPORT MXFSplitter : public KLVHandler {
 public:
   // The position that the splitter stored at the top of its current event,
   // which its delegates and validator see.
@@ -194,7 +194,7 @@ inline constexpr KLVKeyPattern MXFPrivatePropertyPattern =
     KLVKeyPattern(std::array<std::uint8_t, 16>{0x9C, 0xEF, 0x38, 0xE7, 0xD8, 0x04, 0x25, 0x00, 0xC3, 0xD2, 0x00, 0x00,
                                                0x9C, 0xAD, 0x11, 0xE0});
 
-struct MXFPrimerEntry {
+struct ZELTA_EXPORT MXFPrimerEntry {
   std::uint16_t tag = 0;
   KLVKey key;
 
@@ -208,7 +208,7 @@ typedef std::map<KLVKey, std::uint16_t> MXFKeyToTagMap;
 
 // A local set with its tags resolved: the set key as found and its
 // properties by full key. Where an item stood in the file is not kept.
-struct MXFPrimedSet {
+struct ZELTA_EXPORT MXFPrimedSet {
   KLVKey key;
   std::map<KLVKey, ByteVector> properties;
 
@@ -218,11 +218,11 @@ struct MXFPrimedSet {
 
 // The primer that every file of the format may rely on: the static tags of
 // the format classes and the index table segment, in three forms.
-const MXFPrimerEntries& getMXFStandardPrimer();
-const MXFTagToKeyMap& getMXFStandardPrimerKeys();  // tag to key
-const MXFKeyToTagMap& getMXFStandardPrimerTags();  // key to tag
+ZELTA_EXPORT const MXFPrimerEntries& getMXFStandardPrimer();
+ZELTA_EXPORT const MXFTagToKeyMap& getMXFStandardPrimerKeys();  // tag to key
+ZELTA_EXPORT const MXFKeyToTagMap& getMXFStandardPrimerTags();  // key to tag
 
-class MXFMetadataHandler {
+class ZELTA_EXPORT MXFMetadataHandler {
 public:
   virtual ~MXFMetadataHandler();
   virtual void start() = 0;
@@ -237,7 +237,7 @@ public:
 // Turns the local sets with two-octet tags of a KLV stream into primed sets
 // by a primer that a subclass supplies. Sets of other tag sizes, and sets
 // that acceptSet declines, are skipped.
-class MXFPrimedSetParser : public DullKLVHandler {
+class ZELTA_EXPORT MXFPrimedSetParser : public DullKLVHandler {
 public:
   MXFPrimedSetParser();
   MXFPrimedSetParser(const MXFPrimedSetParser&) = delete;
@@ -272,7 +272,7 @@ private:
 
 // The header metadata of one partition as primer and primed sets, with the
 // primer checked against the standard primer.
-class MXFMetadataParser : public MXFPrimedSetParser {
+class ZELTA_EXPORT MXFMetadataParser : public MXFPrimedSetParser {
 public:
   explicit MXFMetadataParser(MXFMetadataHandler* handler);
 
@@ -304,7 +304,7 @@ private:
 // Writes primer and primed sets as header metadata into a KLV handler, all
 // lengths in the four-octet form. From version 1.3 on, the Preface starts at
 // a multiple of 512 octets from the start of the stream.
-class MXFMetadataCoder : public MXFMetadataHandler {
+class ZELTA_EXPORT MXFMetadataCoder : public MXFMetadataHandler {
 public:
   explicit MXFMetadataCoder(KLVHandler* handler);
   MXFMetadataCoder(const MXFMetadataCoder&) = delete;
@@ -330,7 +330,7 @@ private:
 };
 
 // Writes the standard primer ahead of the given entries.
-class MXFFormatMetadataCoder : public MXFMetadataCoder {
+class ZELTA_EXPORT MXFFormatMetadataCoder : public MXFMetadataCoder {
 public:
   using MXFMetadataCoder::MXFMetadataCoder;
   void primer(const MXFPrimerEntries& entries) override;
@@ -338,7 +338,7 @@ public:
 
 // Adds the index table segment's tags that the entries lack, so that the
 // segments after the metadata are served by the same primer.
-class MXFMetadataPlusIndexPrimerCoder : public MXFMetadataCoder {
+class ZELTA_EXPORT MXFMetadataPlusIndexPrimerCoder : public MXFMetadataCoder {
 public:
   using MXFMetadataCoder::MXFMetadataCoder;
   void primer(const MXFPrimerEntries& entries) override;
@@ -350,7 +350,7 @@ public:
 // Writes partition packs and the random index, and fills in the offsets that
 // only the place in the file decides. What the validator reports, the coder
 // refuses by assertion.
-class MXFStructureCoder : public MXFStructureHandler {
+class ZELTA_EXPORT MXFStructureCoder : public MXFStructureHandler {
 public:
   // The padders are shared with the writers of header metadata and index
   // tables: each partition arms them with its byte counts, so that what
@@ -384,7 +384,7 @@ private:
 
 // Reports what is wrong with the partition structure of a file being read,
 // and passes every event on.
-class MXFStructureValidator : public MXFStructureHandler {
+class ZELTA_EXPORT MXFStructureValidator : public MXFStructureHandler {
 public:
   explicit MXFStructureValidator(MXFStructureHandler* handler);
   ~MXFStructureValidator() override;
@@ -412,7 +412,7 @@ private:
 
 // Reads a file from start to end into the four ports, with the structure
 // validated. Every handler is optional and none is owned.
-class MXFReader {
+class ZELTA_EXPORT MXFReader {
 public:
   MXFReader();
   virtual ~MXFReader();
@@ -435,7 +435,7 @@ private:
 };
 
 // Moves a stream to the first partition pack key behind a run-in.
-class MXFRunInSkipper {
+class ZELTA_EXPORT MXFRunInSkipper {
 public:
   MXFRunInSkipper();
   virtual ~MXFRunInSkipper();
@@ -451,7 +451,7 @@ private:
 // Ends a read early, by exception: before the first element at or behind a
 // stop position (StopPosition), or at the next partition pack
 // (EndPartition). The handler behind it sees a clean end of stream.
-class MXFPartitionFilter : public DullKLVFilter {
+class ZELTA_EXPORT MXFPartitionFilter : public DullKLVFilter {
 public:
   class exception {};
   class StopPosition : public exception {};
@@ -503,7 +503,7 @@ inline constexpr KLVKey MXFIndexTableSegmentKey{
     std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x02, 0x53, 0x01, 0x01, 0x0D, 0x01, 0x02, 0x01, 0x01, 0x10,
                                  0x01, 0x00}};
 
-struct MXFDeltaEntry {
+struct ZELTA_EXPORT MXFDeltaEntry {
   std::int8_t posTableIndex = 0;
   std::uint8_t slice = 0;
   std::uint32_t elementDelta = 0;
@@ -515,7 +515,7 @@ struct MXFDeltaEntry {
 };
 
 // One edit unit; flags are left to the indexers to interpret.
-struct MXFIndexEntry {
+struct ZELTA_EXPORT MXFIndexEntry {
   std::int8_t temporalOffset = 0;
   std::int8_t keyFrameOffset = 0;
   std::uint8_t flags = 0;
@@ -531,7 +531,7 @@ struct MXFIndexEntry {
 };
 
 // An all-zero instanceUID asks the coder for a fresh one.
-struct MXFIndexTableSegment {
+struct ZELTA_EXPORT MXFIndexTableSegment {
   MXFUID instanceUID;
   MXFRational indexEditRate;
   std::int64_t indexStartPosition = 0;
@@ -548,7 +548,7 @@ struct MXFIndexTableSegment {
   bool operator!=(const MXFIndexTableSegment& o) const { return !(*this == o); }
 };
 
-class MXFIndexHandler {
+class ZELTA_EXPORT MXFIndexHandler {
 public:
   virtual ~MXFIndexHandler();
   virtual void startIndex() = 0;
@@ -559,7 +559,7 @@ public:
 
 // Index table segments of an index region, by their own fixed tags whatever
 // the partition's primer says.
-class MXFIndexParser : public MXFPrimedSetParser {
+class ZELTA_EXPORT MXFIndexParser : public MXFPrimedSetParser {
 public:
   explicit MXFIndexParser(MXFIndexHandler* handler);
 
@@ -578,7 +578,7 @@ private:
 
 // Writes segments into a KLV handler, each but the last followed by fill up
 // to the KAG.
-class MXFIndexCoder : public MXFIndexHandler {
+class ZELTA_EXPORT MXFIndexCoder : public MXFIndexHandler {
 public:
   explicit MXFIndexCoder(KLVHandler* handler);
   MXFIndexCoder(const MXFIndexCoder&) = delete;
@@ -607,7 +607,7 @@ private:
 // events reach the byte counter directly, the others pass a filter that hides
 // their stream boundaries, metadata and index also a padder that keeps the
 // byte counts that the partition pack promised.
-class MXFMuxer {
+class ZELTA_EXPORT MXFMuxer {
 public:
   MXFMuxer();
   explicit MXFMuxer(KLVHandler* handler);
@@ -631,7 +631,7 @@ private:
 };
 
 // A muxer bound to an output stream.
-class MXFWriter {
+class ZELTA_EXPORT MXFWriter {
 public:
   explicit MXFWriter(std::ostream& stream);
   virtual ~MXFWriter();
@@ -663,7 +663,7 @@ private:
 typedef std::vector<std::pair<std::uint16_t, ByteVector>> MXFGCLocalItems;
 typedef std::vector<ByteVector> MXFGCVariableItems;
 
-class MXFGCStructureHandler {
+class ZELTA_EXPORT MXFGCStructureHandler {
 public:
   virtual ~MXFGCStructureHandler();
   // kagSize is 0 when reading.
@@ -680,7 +680,7 @@ public:
   virtual void endAlignedElement() = 0;
 };
 
-class MXFGCSystemHandler {
+class ZELTA_EXPORT MXFGCSystemHandler {
 public:
   virtual ~MXFGCSystemHandler();
   // True when the element is wanted.
@@ -690,7 +690,7 @@ public:
   virtual void systemVariablePack(const KLVKey& key, const MXFGCVariableItems& items) = 0;
 };
 
-class MXFGCEssenceHandler {
+class ZELTA_EXPORT MXFGCEssenceHandler {
 public:
   virtual ~MXFGCEssenceHandler();
   // True when the element is wanted. The handler may point buffer at memory
@@ -722,14 +722,14 @@ inline constexpr KLVKeyPattern MXFGCEssenceElementPattern =
 
 // Octet 12: system 0x14 or 0x04, picture 0x15 or 0x05, sound 0x16 or 0x06,
 // data 0x17 or 0x07, compound 0x18 only.
-bool isMXFGCSystemKey(const KLVKey& key);
-bool isMXFGCEssenceKey(const KLVKey& key);
-bool isMXFGCPictureKey(const KLVKey& key);
-bool isMXFGCSoundKey(const KLVKey& key);
-bool isMXFGCDataKey(const KLVKey& key);
-bool isMXFGCCompoundKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFGCSystemKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFGCEssenceKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFGCPictureKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFGCSoundKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFGCDataKey(const KLVKey& key);
+ZELTA_EXPORT bool isMXFGCCompoundKey(const KLVKey& key);
 
-class DullMXFGCStructureHandler : public MXFGCStructureHandler {
+class ZELTA_EXPORT DullMXFGCStructureHandler : public MXFGCStructureHandler {
 public:
   void start(std::uint64_t kagSize) override;
   void end() override;
@@ -744,7 +744,7 @@ public:
 };
 
 // Wants no element.
-class DullMXFGCSystemHandler : public MXFGCSystemHandler {
+class ZELTA_EXPORT DullMXFGCSystemHandler : public MXFGCSystemHandler {
 public:
   bool startSystemElement(const KLVKey& key) override;
   void systemLocalSet(const KLVKey& key, const MXFGCLocalItems& items) override;
@@ -753,7 +753,7 @@ public:
 };
 
 // Wants no element.
-class DullMXFGCEssenceHandler : public MXFGCEssenceHandler {
+class ZELTA_EXPORT DullMXFGCEssenceHandler : public MXFGCEssenceHandler {
 public:
   bool startEssenceElement(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
   void pictureElement(const KLVKey& key, const std::uint8_t* data, std::uint64_t length) override;
@@ -773,7 +773,7 @@ public:
 // Whatever buffer a client gives its std::ifstream, the reader reads a large
 // value from the file straight into the handler's buffer; small values come
 // out of the reader's read-ahead.
-class MXFGCSplitter : public DullKLVHandler {
+class ZELTA_EXPORT MXFGCSplitter : public DullKLVHandler {
 public:
   MXFGCSplitter();
   MXFGCSplitter(MXFGCStructureHandler* structureHandler, MXFGCSystemHandler* systemHandler,
@@ -835,7 +835,7 @@ private:
 
 // Brings each group of elements to an exact length (padded) or to an
 // alignment with one fill item at the group's end.
-class MXFGCStructurePadder : public MXFGCStructureHandler {
+class ZELTA_EXPORT MXFGCStructurePadder : public MXFGCStructureHandler {
 public:
   MXFGCStructurePadder(KLVHandler* handler, Locator* locator);
   MXFGCStructurePadder(const MXFGCStructurePadder&) = delete;
@@ -865,7 +865,7 @@ private:
 // Writes system elements as local sets, fixed length packs and variable
 // length packs with four-octet BER lengths; the key's octet 5 says the
 // coding of a set or pack.
-class MXFGCSystemCoder : public MXFGCSystemHandler {
+class ZELTA_EXPORT MXFGCSystemCoder : public MXFGCSystemHandler {
 public:
   explicit MXFGCSystemCoder(KLVHandler* handler);
 
@@ -883,7 +883,7 @@ private:
 // caller's memory. The length form is the one last given to
 // essenceLengthForm, or, while that is 0x80, 0x83 below 0x1000000 octets
 // and 0x87 from there.
-class MXFGCEssenceCoder : public MXFGCEssenceHandler {
+class ZELTA_EXPORT MXFGCEssenceCoder : public MXFGCEssenceHandler {
 public:
   explicit MXFGCEssenceCoder(KLVHandler* handler);
 
@@ -903,7 +903,7 @@ private:
 
 // The KLV stream of an essence container from the three generic-container
 // event streams; its locator gives the position in what it wrote.
-class MXFGCMuxer {
+class ZELTA_EXPORT MXFGCMuxer {
 public:
   MXFGCMuxer();
   explicit MXFGCMuxer(KLVHandler* handler);
@@ -928,7 +928,7 @@ private:
 // Stands in front of a muxer's structure handler and tells, when an edit
 // unit has ended, where it started and where its slices after the first
 // started, relative to it. Everything is passed on ("handler is present").
-class MXFGCIndexer : public MXFGCStructureHandler {
+class ZELTA_EXPORT MXFGCIndexer : public MXFGCStructureHandler {
 public:
   MXFGCIndexer(MXFGCStructureHandler* handler, Locator* locator);
   MXFGCIndexer(const MXFGCIndexer&) = delete;

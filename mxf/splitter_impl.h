@@ -7,7 +7,7 @@
 
 #include "mxf.h"
 
-class MXFSplitter::DelegatedLocator : public Locator {
+class ZELTA_LOCAL MXFSplitter::DelegatedLocator : public Locator {
 public:
   const std::streampos& getPosition() override { return position_; }
   void setPosition(const std::streampos& position) { position_ = position; }
@@ -16,7 +16,7 @@ private:
   std::streampos position_ = -1;
 };
 
-class MXFSplitter::Impl final : public KLVHandler {
+class ZELTA_LOCAL MXFSplitter::Impl final : public KLVHandler {
 public:
   Impl(MXFStructureHandler* structureHandler, KLVHandler* metadataHandler, KLVHandler* indexHandler,
        KLVHandler* essenceHandler, bool validate);

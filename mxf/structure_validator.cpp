@@ -22,7 +22,7 @@ std::string versionMessage(const char* text, const MXFPartitionPack& pack) {
 
 }  // namespace
 
-class MXFStructureValidator::Impl {
+class ZELTA_LOCAL MXFStructureValidator::Impl {
 public:
   explicit Impl(MXFStructureHandler* handler) : handler_(handler) {}
 
