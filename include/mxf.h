@@ -10,5 +10,8 @@
 #include "mxf_index.h"
 #include "mxf_writer.h"
 #include "mxf_generic_container.h"
+#include "mxf_d10.h"
+#include "mxf_system.h"
+#include "mxf_picture_index.h"
 
 #endif

@@ -4,8 +4,8 @@
 
 namespace zelta_info {
 
-EssenceCollector::EssenceCollector(Essence& essence, bool md5, ErrorHandler* errors)
-    : essence_(essence), md5_(md5), splitter_(std::make_unique<MXFGCSplitter>(this, this, this)) {
+EssenceCollector::EssenceCollector(Essence* essence, bool md5, SystemCollector* system, ErrorHandler* errors)
+    : essence_(essence), md5_(md5 && essence != nullptr), system_(system), splitter_(std::make_unique<MXFGCSplitter>(this, this, this)) {
   splitter_->setErrorHandler(errors);
   setHandler(splitter_.get());
 }
@@ -35,7 +35,8 @@ void EssenceCollector::end() {}
 // Each partition's essence is a container stream of its own, so the digests
 // run on until the whole file has been read.
 void EssenceCollector::finish() {
-  for (ElementTotal& total : essence_.totals) {
+  if (!essence_) return;
+  for (ElementTotal& total : essence_->totals) {
     const auto digest = digests_.find(total.key);
     if (digest != digests_.end()) total.md5 = digest->second.hexDigest();
   }
@@ -43,13 +44,27 @@ void EssenceCollector::finish() {
 }
 
 void EssenceCollector::startEditUnit() {
-  ++essence_.editUnits;
-  essence_.units.emplace_back();
+  if (system_) system_->startEditUnit();
+  if (!essence_) return;
+  ++essence_->editUnits;
+  essence_->units.emplace_back();
 }
 
 bool EssenceCollector::startSystemElement(const KLVKey& key) {
   add("system", key, elementLength_);
-  return false;
+  return system_ && system_->startSystemElement(key);
+}
+
+void EssenceCollector::systemLocalSet(const KLVKey& key, const MXFGCLocalItems& items) {
+  system_->systemLocalSet(key, items);
+}
+
+void EssenceCollector::systemFixedPack(const KLVKey& key, const ByteVector& bytes) {
+  system_->systemFixedPack(key, bytes);
+}
+
+void EssenceCollector::systemVariablePack(const KLVKey& key, const MXFGCVariableItems& items) {
+  system_->systemVariablePack(key, items);
 }
 
 const char* EssenceCollector::kindOf(const KLVKey& key) const {
@@ -61,15 +76,16 @@ const char* EssenceCollector::kindOf(const KLVKey& key) const {
 
 ElementTotal& EssenceCollector::total(const KLVKey& key, const std::string& kind) {
   const auto found = totalIndex_.find(key);
-  if (found != totalIndex_.end()) return essence_.totals[found->second];
-  totalIndex_.emplace(key, essence_.totals.size());
-  essence_.totals.push_back(ElementTotal{key, kind, 0, 0, std::string()});
+  if (found != totalIndex_.end()) return essence_->totals[found->second];
+  totalIndex_.emplace(key, essence_->totals.size());
+  essence_->totals.push_back(ElementTotal{key, kind, 0, 0, std::string()});
   if (md5_ && kind != "system") digests_.emplace(key, MD5());
-  return essence_.totals.back();
+  return essence_->totals.back();
 }
 
 void EssenceCollector::add(const std::string& kind, const KLVKey& key, std::uint64_t length) {
-  if (!essence_.units.empty()) essence_.units.back().push_back(ElementEvent{kind, key, length});
+  if (!essence_) return;
+  if (!essence_->units.empty()) essence_->units.back().push_back(ElementEvent{kind, key, length});
   ElementTotal& sum = total(key, kind);
   sum.count += 1;
   sum.bytes += length;
@@ -77,6 +93,7 @@ void EssenceCollector::add(const std::string& kind, const KLVKey& key, std::uint
 
 // The value is read straight into our buffer, whatever its size.
 bool EssenceCollector::startEssenceElement(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
+  if (!essence_) return false;
   add(kindOf(key), key, length);
   if (!md5_) return false;
   if (buffer_.size() < length) buffer_.resize(length);

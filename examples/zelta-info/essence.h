@@ -13,6 +13,7 @@
 #include "klv.h"
 #include "md5.h"
 #include "mxf.h"
+#include "system.h"
 
 namespace zelta_info {
 
@@ -38,11 +39,12 @@ struct Essence {
 };
 
 // Sits in front of the splitter: notes the length of each top-level element
-// for the system element events, which carry none.
+// for the system element events, which carry none. Essence is noted when
+// asked for; system items go on to the system collector, when there is one.
 class EssenceCollector : public DullKLVFilter, public MXFGCStructureHandler, public MXFGCSystemHandler,
                          public MXFGCEssenceHandler {
 public:
-  EssenceCollector(Essence& essence, bool md5, ErrorHandler* errors);
+  EssenceCollector(Essence* essence, bool md5, SystemCollector* system, ErrorHandler* errors);
   ~EssenceCollector() override;
   // Ends the digests, after the read.
   void finish();
@@ -64,9 +66,9 @@ public:
   void endAlignedElement() override {}
 
   bool startSystemElement(const KLVKey& key) override;
-  void systemLocalSet(const KLVKey&, const MXFGCLocalItems&) override {}
-  void systemFixedPack(const KLVKey&, const ByteVector&) override {}
-  void systemVariablePack(const KLVKey&, const MXFGCVariableItems&) override {}
+  void systemLocalSet(const KLVKey& key, const MXFGCLocalItems& items) override;
+  void systemFixedPack(const KLVKey& key, const ByteVector& bytes) override;
+  void systemVariablePack(const KLVKey& key, const MXFGCVariableItems& items) override;
 
   bool startEssenceElement(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) override;
   void pictureElement(const KLVKey& key, const std::uint8_t* data, std::uint64_t length) override;
@@ -81,8 +83,9 @@ private:
   void add(const std::string& kind, const KLVKey& key, std::uint64_t length);
   void digest(const KLVKey& key, const std::uint8_t* data, std::uint64_t length);
 
-  Essence& essence_;
+  Essence* essence_;
   bool md5_;
+  SystemCollector* system_;
   std::unique_ptr<MXFGCSplitter> splitter_;
   std::uint64_t elementLength_ = 0;
   std::map<KLVKey, std::size_t> totalIndex_;

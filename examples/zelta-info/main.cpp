@@ -13,7 +13,7 @@ namespace {
 using namespace zelta_info;
 
 const char* const usage =
-    "usage: zelta-info [--json] [--sets] [--index] [--essence [--md5]] [--model] FILE\n"
+    "usage: zelta-info [--json] [--sets] [--index] [--essence [--md5]] [--system] [--model] FILE\n"
     "       zelta-info --copy OUT FILE\n"
     "\n"
     "Reads the MXF file FILE (a run-in is skipped) and prints each partition\n"
@@ -24,7 +24,8 @@ const char* const usage =
     "\n"
     "  --json   print one JSON object instead (file, result, runIn, partitions,\n"
     "           randomIndex, metadata with --sets, index with --index,\n"
-    "           essence with --essence, model with --model, reports)\n"
+    "           essence with --essence, system with --system, model with\n"
+    "           --model, reports)\n"
     "  --sets   also print the primer and the primed sets (set key, property\n"
     "           keys and sizes) of each partition's header metadata\n"
     "  --index  also print every index table segment with its fields, delta\n"
@@ -35,6 +36,12 @@ const char* const usage =
     "           and bytes of the elements of each key\n"
     "  --md5    with --essence, also the MD5 of the concatenated values of\n"
     "           the essence elements of each key\n"
+    "  --system also print the system item of each edit unit through the\n"
+    "           SDTI-CP and proxy system parsers: the system metadata pack\n"
+    "           (bitmap, rate, type, channel handle, continuity count, label,\n"
+    "           creation and user stamps as octets) and the items of each\n"
+    "           metadata set and of the control data, or the proxy element's\n"
+    "           frameCount and timecodes; the parsers' reports join the others\n"
     "  --model  also print the object model of the header metadata of the\n"
     "           first partition that holds any, the header partition in a\n"
     "           well-formed file, also when the header is open and the footer\n"
@@ -82,9 +89,11 @@ bool readFile(std::istream& in, Summary& summary, const Details& details) {
   SectionCounter metadata(summary, metadataSection,
                           details.sets || details.model ? static_cast<KLVHandler*>(&setParser) : &skipper);
   SectionCounter index(summary, indexSection, details.index ? static_cast<KLVHandler*>(&indexParser) : &skipper);
-  EssenceCollector essenceCollector(summary.essence, details.md5, &reporter);
+  SystemCollector systemCollector(summary.system, &reporter);
+  EssenceCollector essenceCollector(details.essence ? &summary.essence : nullptr, details.md5,
+                                    details.system ? &systemCollector : nullptr, &reporter);
   SectionCounter essence(summary, essenceSection,
-                         details.essence ? static_cast<KLVHandler*>(&essenceCollector) : &skipper);
+                         details.essence || details.system ? static_cast<KLVHandler*>(&essenceCollector) : &skipper);
   StructureCollector structure(summary);
   MXFReader reader;
   reader.setSkipRunIn(true);
@@ -150,6 +159,8 @@ bool parseOptions(int argc, char** argv, Options& options) {
       options.details.essence = true;
     } else if (std::strcmp(argv[i], "--md5") == 0) {
       options.details.md5 = true;
+    } else if (std::strcmp(argv[i], "--system") == 0) {
+      options.details.system = true;
     } else if (std::strcmp(argv[i], "--model") == 0) {
       options.details.model = true;
     } else if (std::strcmp(argv[i], "--copy") == 0 && i + 1 < argc) {

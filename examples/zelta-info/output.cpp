@@ -202,6 +202,7 @@ void printText(std::ostream& out, const Summary& s, const Details& details) {
   if (details.index)
     for (const Index& index : s.index) printIndexText(out, index);
   if (details.essence) printEssenceText(out, s.essence);
+  if (details.system) printSystemText(out, s.system);
   if (details.model) printModelText(out, s.model);
 }
 
@@ -239,6 +240,10 @@ void printJson(std::ostream& out, const std::string& file, bool fatal, const Sum
   if (details.essence) {
     out << ", \"essence\": ";
     printEssenceJson(out, s.essence);
+  }
+  if (details.system) {
+    out << ", \"system\": ";
+    printSystemJson(out, s.system);
   }
   if (details.model) {
     out << ", \"model\": ";

@@ -56,6 +56,7 @@ struct Summary {
   std::vector<Metadata> metadata;
   std::vector<Index> index;
   Essence essence;
+  SystemItems system;
   Model model;
   std::vector<Report> reports;
   std::uint64_t suppressed = 0;  // reports neither kept nor echoed
@@ -164,6 +165,7 @@ struct Details {
   bool index = false;
   bool essence = false;
   bool md5 = false;
+  bool system = false;
   bool model = false;
 };
 
