@@ -47,7 +47,7 @@ void AVCBitReader::leaveNAL() {
   bitsLeft_ = 0;
 }
 
-std::uint8_t AVCBitReader::takeOctet() {
+std::uint8_t AVCBitReader::takeOctetAtEdge() {
   check(position_ < size_, "successful read()");
   std::uint8_t octet = data_[position_++];
   if (!inNAL_) return octet;
@@ -60,25 +60,38 @@ std::uint8_t AVCBitReader::takeOctet() {
   return octet;
 }
 
-std::uint32_t AVCBitReader::bits(unsigned count) {
-  std::uint32_t value = 0;
-  for (unsigned i = 0; i < count; ++i) {
+// Whole runs of the current octet at a time.
+std::uint32_t AVCBitReader::bitsAcrossOctets(unsigned count) {
+  std::uint64_t value = 0;
+  while (count > 0) {
     if (bitsLeft_ == 0) {
       octet_ = takeOctet();
       bitsLeft_ = 8;
     }
-    --bitsLeft_;
-    value = (value << 1) | ((octet_ >> bitsLeft_) & 1u);
+    const unsigned take = count < bitsLeft_ ? count : bitsLeft_;
+    bitsLeft_ -= take;
+    value = (value << take) | ((octet_ >> bitsLeft_) & ((1u << take) - 1));
+    count -= take;
   }
-  return value;
+  return static_cast<std::uint32_t>(value);
 }
 
-std::uint32_t AVCBitReader::unsignedCode() {
+// The leading zeros are counted an octet at a time.
+std::uint32_t AVCBitReader::codeAcrossOctets() {
   unsigned zeros = 0;
-  while (!flag()) {
-    ++zeros;
+  for (;;) {
+    if (bitsLeft_ == 0) {
+      octet_ = takeOctet();
+      bitsLeft_ = 8;
+    }
+    const unsigned rest = octet_ & ((1u << bitsLeft_) - 1);
+    const unsigned leading = rest == 0 ? bitsLeft_ : static_cast<unsigned>(__builtin_clz(rest)) - (32 - bitsLeft_);
+    zeros += leading;
     check(zeros <= longestExpGolombPrefix, "valid Exp-Golomb code");
+    bitsLeft_ -= leading;
+    if (rest != 0) break;
   }
+  --bitsLeft_;  // the one that ends the prefix
   if (zeros == 0) return 0;
   return ((1u << zeros) - 1) + bits(zeros);
 }

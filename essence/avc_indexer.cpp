@@ -182,6 +182,7 @@ private:
   MXFIndexTableSegment* segment_;
   zelta::AVCAccessUnitParser parser_;
   std::vector<PendingPicture> pending_;
+  std::vector<std::size_t> displayOrder_;
   MPEGIndexer calculation_;
 };
 
@@ -212,13 +213,17 @@ void MXFAVCIndexer::Impl::flush(bool streamEnds) {
   check(segment_ != nullptr, "segment is present");
   std::size_t count = pending_.size();
   if (!streamEnds && count > 0 && pending_.back().picture.pictureOrderCount == 0) --count;
-  std::vector<std::size_t> displayOrder(count);
-  std::iota(displayOrder.begin(), displayOrder.end(), std::size_t(0));
-  std::stable_sort(displayOrder.begin(), displayOrder.end(), [this](std::size_t a, std::size_t b) {
-    return pending_[a].picture.pictureOrderCount < pending_[b].picture.pictureOrderCount;
+  // Equal counts keep their stored order; the order's memory is kept from
+  // one GOP to the next.
+  displayOrder_.resize(count);
+  std::iota(displayOrder_.begin(), displayOrder_.end(), std::size_t(0));
+  std::sort(displayOrder_.begin(), displayOrder_.end(), [this](std::size_t a, std::size_t b) {
+    const std::int64_t countA = pending_[a].picture.pictureOrderCount;
+    const std::int64_t countB = pending_[b].picture.pictureOrderCount;
+    return countA < countB || (countA == countB && a < b);
   });
   for (std::size_t rank = 0; rank < count; ++rank)
-    pending_[displayOrder[rank]].picture.picture.displayIndex = static_cast<std::uint16_t>(rank);
+    pending_[displayOrder_[rank]].picture.picture.displayIndex = static_cast<std::uint16_t>(rank);
   for (std::size_t i = 0; i < count; ++i) {
     calculation_.addPicture(pending_[i].picture.picture);
     segment_->indexEntryArray.push_back(

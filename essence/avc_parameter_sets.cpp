@@ -286,6 +286,8 @@ AVCSliceHeader AVCParameterSets::readSliceHeader(AVCBitReader& reader, bool idr,
     if (bottomDelta) header.deltaPicOrderCnt[1] = reader.signedCode();
   }
   if (picture.redundantPicCntPresent) reader.unsignedCode();  // redundant_pic_cnt
+  // What follows matters only for the memory management of a reference.
+  if (!reference) return header;
 
   const SliceKind kind = kindOf(header.sliceType);
   const bool predicted = kind == pSlice || kind == spSlice;

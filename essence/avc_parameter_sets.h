@@ -61,7 +61,8 @@ public:
   void readPictureParameterSet(AVCBitReader& reader);
   // "found picture parameter set for slice", "found sequence parameter set
   // for slice", "valid memory_management_control_operation". The header
-  // refers to a set of this object.
+  // refers to a set of this object. A reference is read up to and with its
+  // dec_ref_pic_marking, any other slice only up to its redundant_pic_cnt.
   AVCSliceHeader readSliceHeader(AVCBitReader& reader, bool idr, bool reference) const;
 
 private:

@@ -417,7 +417,12 @@ TEST(AVCIndexerParameterSets, SliceHeadersAreReadUpToDecRefPicMarking) {
   EXPECT_TRUE(idr.fieldPic);
   EXPECT_TRUE(idr.bottomField);
   EXPECT_FALSE(idr.resetsMemory);
-  const zelta::AVCSliceHeader unmarked = sliceHeader(sets, slice(1, 3, 4).bytes(sps, pps, false, 0), false, false);
+  // A picture that is no reference is read only up to its counts.
+  const ByteVector unmarkedBytes = slice(1, 3, 4).bytes(sps, pps, false, 0);
+  zelta::AVCBitReader reader = behindHeader(unmarkedBytes);
+  const zelta::AVCSliceHeader unmarked = sets.readSliceHeader(reader, false, false);
+  EXPECT_EQ(unmarked.frameNum, 3u);
+  EXPECT_EQ(unmarked.picOrderCntLsb, 4u);
   EXPECT_FALSE(unmarked.resetsMemory);
 }
 
