@@ -3,6 +3,8 @@
 // tool prints, and codes back to the octets that the file holds.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <string>
@@ -42,6 +44,56 @@ const std::vector<FileSystemItems> files{
      {"81 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
       "81 01 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
       "81 02 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00"}},
+    // Damaged only by its missing random index; its content packages are whole.
+    {"damaged_no_rip.mxf",
+     0x5C, 0x04, 0x00, 0x0000,
+     "06.0E.2B.34.04.01.01.01.0D.01.03.01.02.01.05.01",
+     "00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+     {0x0000, 0x0001, 0x0002, 0x0003},
+     {"81 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 01 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 02 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 03 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00"}},
+    {"ffmpeg_dv25_625_420_2mono.mxf",
+     0x5C, 0x04, 0x00, 0x0000,
+     "06.0E.2B.34.04.01.01.03.0D.01.03.01.02.7F.01.00",
+     "00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+     {0x0000, 0x0001, 0x0002, 0x0003, 0x0004, 0x0005},
+     {"81 00 00 00 10 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 01 00 00 10 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 02 00 00 10 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 03 00 00 10 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 04 00 00 10 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 05 00 00 10 00 00 00 00 00 00 00 00 00 00 00 00"}},
+    {"ffmpeg_h264_high_longgop_1080p25_2mono.mxf",
+     0x5C, 0x04, 0x00, 0x0000,
+     "06.0E.2B.34.04.01.01.03.0D.01.03.01.02.7F.01.00",
+     "00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+     {0x0000, 0x0001, 0x0002, 0x0003, 0x0004, 0x0005, 0x0006, 0x0007, 0x0008, 0x0009, 0x000A, 0x000B, 0x000C, 0x000D, 0x000E, 0x000F, 0x0010, 0x0011, 0x0012, 0x0013, 0x0014, 0x0015, 0x0016, 0x0017},
+     {"81 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 01 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 02 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 03 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 04 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 05 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 06 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 07 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 08 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 09 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 10 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 11 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 12 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 13 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 14 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 15 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 16 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 17 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 18 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 19 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 20 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 21 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 22 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00",
+      "81 23 00 00 00 00 00 00 00 00 00 00 00 00 00 00 00"}},
     {"bmx_d10_50m_625_8ch24.mxf",
      0x5C, 0x04, 0x00, 0x0000,
      "06.0E.2B.34.04.01.01.01.0D.01.03.01.02.01.01.01",
@@ -283,6 +335,44 @@ TEST_P(SystemItemsInterop, SystemElementsCodeBackToTheOctetsOfTheFile) {
   // A pack and a package metadata set in each edit unit.
   EXPECT_EQ(read.capture.elements, static_cast<int>(2 * GetParam().continuityCounts.size()));
   EXPECT_EQ(klv::outputOf(read.out), read.capture.octets);
+}
+
+// The table above holds every file of the test data that has system items.
+TEST(SystemItemsInterop, NoOtherTestFileCarriesSystemItems) {
+  class SystemKeys : public DullKLVHandler {
+  public:
+    bool startIndividualItem(const KLVKey& key, std::uint64_t, std::uint8_t*&) override { return count(key); }
+    bool startLocalSet(const KLVKey& key, std::uint64_t, KLVTagType, KLVLengthType) override { return count(key); }
+    bool startFixedLengthPack(const KLVKey& key, std::uint64_t, std::uint8_t*&) override { return count(key); }
+    bool startVariableLengthPack(const KLVKey& key, std::uint64_t, KLVLengthType) override { return count(key); }
+    int elements = 0;
+
+  private:
+    bool count(const KLVKey& key) {
+      if (isMXFGCSystemKey(key)) ++elements;
+      return false;
+    }
+  };
+  int others = 0;
+  for (const auto& entry : std::filesystem::directory_iterator(ZELTA_TEST_DATA)) {
+    const std::string name = entry.path().filename().string();
+    if (entry.path().extension() != ".mxf" ||
+        std::any_of(files.begin(), files.end(), [&](const FileSystemItems& file) { return name == file.name; }))
+      continue;
+    SCOPED_TRACE(name);
+    SystemKeys keys;
+    MXFReader reader;
+    reader.setEssenceHandler(&keys);
+    std::ifstream in(entry.path(), std::ios::binary);
+    try {
+      reader.read(in);
+    } catch (const std::exception&) {
+      // A damaged file is looked at up to its damage.
+    }
+    EXPECT_EQ(keys.elements, 0);
+    ++others;
+  }
+  EXPECT_GT(others, 0);
 }
 
 INSTANTIATE_TEST_SUITE_P(Files, SystemItemsInterop, ::testing::ValuesIn(files), testName);
