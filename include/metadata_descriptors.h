@@ -607,6 +607,7 @@ enum class MXFPropertyKind {
   uid,
   umid,
   wideString,
+  narrowString,  // octets as they stand
   bytes,
   uint32Batch,
   int32Batch,

@@ -28,27 +28,50 @@ template <typename T>
 struct PropertyKindOf : std::integral_constant<MXFPropertyKind, MXFPropertyKind::opaque> {};
 template <MXFPropertyKind K>
 using PropertyKindIs = std::integral_constant<MXFPropertyKind, K>;
-template <> struct PropertyKindOf<std::uint8_t> : PropertyKindIs<MXFPropertyKind::uint8> {};
-template <> struct PropertyKindOf<std::uint16_t> : PropertyKindIs<MXFPropertyKind::uint16> {};
-template <> struct PropertyKindOf<std::uint32_t> : PropertyKindIs<MXFPropertyKind::uint32> {};
-template <> struct PropertyKindOf<std::uint64_t> : PropertyKindIs<MXFPropertyKind::uint64> {};
-template <> struct PropertyKindOf<std::int8_t> : PropertyKindIs<MXFPropertyKind::int8> {};
-template <> struct PropertyKindOf<std::int16_t> : PropertyKindIs<MXFPropertyKind::int16> {};
-template <> struct PropertyKindOf<std::int32_t> : PropertyKindIs<MXFPropertyKind::int32> {};
-template <> struct PropertyKindOf<std::int64_t> : PropertyKindIs<MXFPropertyKind::int64> {};
-template <> struct PropertyKindOf<bool> : PropertyKindIs<MXFPropertyKind::boolean> {};
-template <> struct PropertyKindOf<MXFRational> : PropertyKindIs<MXFPropertyKind::rational> {};
-template <> struct PropertyKindOf<MXFTimestamp> : PropertyKindIs<MXFPropertyKind::timestamp> {};
-template <> struct PropertyKindOf<MXFProductVersion> : PropertyKindIs<MXFPropertyKind::productVersion> {};
-template <> struct PropertyKindOf<KLVKey> : PropertyKindIs<MXFPropertyKind::key> {};
-template <> struct PropertyKindOf<MXFUID> : PropertyKindIs<MXFPropertyKind::uid> {};
-template <> struct PropertyKindOf<UMID> : PropertyKindIs<MXFPropertyKind::umid> {};
-template <> struct PropertyKindOf<std::wstring> : PropertyKindIs<MXFPropertyKind::wideString> {};
-template <> struct PropertyKindOf<ByteVector> : PropertyKindIs<MXFPropertyKind::bytes> {};
-template <> struct PropertyKindOf<std::vector<std::uint32_t>> : PropertyKindIs<MXFPropertyKind::uint32Batch> {};
-template <> struct PropertyKindOf<std::vector<std::int32_t>> : PropertyKindIs<MXFPropertyKind::int32Batch> {};
-template <> struct PropertyKindOf<std::vector<KLVKey>> : PropertyKindIs<MXFPropertyKind::keyBatch> {};
-template <> struct PropertyKindOf<RGBALayout> : PropertyKindIs<MXFPropertyKind::rgbaLayout> {};
+template <>
+struct PropertyKindOf<std::uint8_t> : PropertyKindIs<MXFPropertyKind::uint8> {};
+template <>
+struct PropertyKindOf<std::uint16_t> : PropertyKindIs<MXFPropertyKind::uint16> {};
+template <>
+struct PropertyKindOf<std::uint32_t> : PropertyKindIs<MXFPropertyKind::uint32> {};
+template <>
+struct PropertyKindOf<std::uint64_t> : PropertyKindIs<MXFPropertyKind::uint64> {};
+template <>
+struct PropertyKindOf<std::int8_t> : PropertyKindIs<MXFPropertyKind::int8> {};
+template <>
+struct PropertyKindOf<std::int16_t> : PropertyKindIs<MXFPropertyKind::int16> {};
+template <>
+struct PropertyKindOf<std::int32_t> : PropertyKindIs<MXFPropertyKind::int32> {};
+template <>
+struct PropertyKindOf<std::int64_t> : PropertyKindIs<MXFPropertyKind::int64> {};
+template <>
+struct PropertyKindOf<bool> : PropertyKindIs<MXFPropertyKind::boolean> {};
+template <>
+struct PropertyKindOf<MXFRational> : PropertyKindIs<MXFPropertyKind::rational> {};
+template <>
+struct PropertyKindOf<MXFTimestamp> : PropertyKindIs<MXFPropertyKind::timestamp> {};
+template <>
+struct PropertyKindOf<MXFProductVersion> : PropertyKindIs<MXFPropertyKind::productVersion> {};
+template <>
+struct PropertyKindOf<KLVKey> : PropertyKindIs<MXFPropertyKind::key> {};
+template <>
+struct PropertyKindOf<MXFUID> : PropertyKindIs<MXFPropertyKind::uid> {};
+template <>
+struct PropertyKindOf<UMID> : PropertyKindIs<MXFPropertyKind::umid> {};
+template <>
+struct PropertyKindOf<std::wstring> : PropertyKindIs<MXFPropertyKind::wideString> {};
+template <>
+struct PropertyKindOf<std::string> : PropertyKindIs<MXFPropertyKind::narrowString> {};
+template <>
+struct PropertyKindOf<ByteVector> : PropertyKindIs<MXFPropertyKind::bytes> {};
+template <>
+struct PropertyKindOf<std::vector<std::uint32_t>> : PropertyKindIs<MXFPropertyKind::uint32Batch> {};
+template <>
+struct PropertyKindOf<std::vector<std::int32_t>> : PropertyKindIs<MXFPropertyKind::int32Batch> {};
+template <>
+struct PropertyKindOf<std::vector<KLVKey>> : PropertyKindIs<MXFPropertyKind::keyBatch> {};
+template <>
+struct PropertyKindOf<RGBALayout> : PropertyKindIs<MXFPropertyKind::rgbaLayout> {};
 
 template <typename C>
 struct PropertyDescriptor {
@@ -68,13 +91,15 @@ struct PropertyDescriptor {
 
 template <typename C>
 class PropertyTable {
-public:
+ public:
   // The class name goes into the check of the object's class.
   PropertyTable(const std::string& className, std::vector<PropertyDescriptor<C>> properties)
       : className_(className), isClass_("object is a " + className), properties_(std::move(properties)) {}
   // The table of a class of the format, with the key of its sets.
   PropertyTable(const std::string& className, const KLVKey& setKey, std::vector<PropertyDescriptor<C>> properties)
-      : className_(className), isClass_("object is a " + className), setKey_(setKey),
+      : className_(className),
+        isClass_("object is a " + className),
+        setKey_(setKey),
         properties_(std::move(properties)) {}
 
   const KLVKey& getSetKey() const { return setKey_; }
@@ -121,7 +146,7 @@ public:
     }
   }
 
-private:
+ private:
   std::string className_;
   std::string isClass_;
   KLVKey setKey_;
@@ -146,6 +171,13 @@ struct PropertyKey {
   KLVKey key;
   std::uint16_t tag;
 };
+
+// A property key of the registry as the class tables spell it: 06 0E 2B 34
+// 01 01 01, the version octet, then the eight octets of the item.
+inline KLVKey registeredPropertyKey(std::uint8_t version, const std::array<std::uint8_t, 8>& item) {
+  return KLVKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, version, item[0], item[1],
+                                             item[2], item[3], item[4], item[5], item[6], item[7]});
+}
 
 // The set key of a class of the format: 06 0E 2B 34 02 53 01 01 0D 01 01 01 01 01,
 // the class octet, 00.
@@ -331,8 +363,7 @@ void MetadataClassFactory<C, Base>::parseProperties(const MXFPropertyMap& proper
 
 template <typename C, typename Base>
 void MetadataClassFactory<C, Base>::codeProperties(const std::shared_ptr<const MetadataRoot>& object,
-                                                   MXFPropertyMap& properties,
-                                                   MXFReferencedObjects& referenced) const {
+                                                   MXFPropertyMap& properties, MXFReferencedObjects& referenced) const {
   const zelta::PropertyTable<C>& table = zelta::propertyTable<C>();
   const C& typed = table.cast(object);
   Base::codeProperties(object, properties, referenced);

@@ -151,6 +151,7 @@ ModelValue propertyValue(MXFMetadataModelFactory& factory, MXFPropertyKind kind,
     case MXFPropertyKind::uid: return textValue(identifierText(decoded<MXFUID>(octets)));
     case MXFPropertyKind::umid: return textValue(hexText(decoded<UMID>(octets).octets));
     case MXFPropertyKind::wideString: return textValue(utf8Text(decoded<std::wstring>(octets)));
+    case MXFPropertyKind::narrowString: return textValue(decoded<std::string>(octets));
     case MXFPropertyKind::bytes: return textValue(hexText(decoded<ByteVector>(octets)));
     case MXFPropertyKind::uint32Batch: return numberList<std::uint32_t>(octets);
     case MXFPropertyKind::int32Batch: return numberList<std::int32_t>(octets);
