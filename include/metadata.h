@@ -1,6 +1,6 @@
 // Zelta: the metadata model, one header of sub-headers: objects, factories
 // and model coding; the structural classes; locators and descriptors;
-// text-based descriptive metadata.
+// text-based descriptive metadata; acquisition metadata objects.
 #ifndef ZELTA_METADATA_H
 #define ZELTA_METADATA_H
 
@@ -8,5 +8,6 @@
 #include "metadata_structural.h"
 #include "metadata_descriptors.h"
 #include "metadata_text_based.h"
+#include "metadata_acquisition.h"
 
 #endif

@@ -104,6 +104,12 @@ class PropertyTable {
 
   const KLVKey& getSetKey() const { return setKey_; }
   const std::string& getClassName() const { return className_; }
+  // The class's own property keys, in table order.
+  std::vector<KLVKey> keys() const {
+    std::vector<KLVKey> keys;
+    for (const PropertyDescriptor<C>& property : properties_) keys.push_back(property.key);
+    return keys;
+  }
 
   void enterInto(MXFKeyToTagMap& setPrimer) const {
     for (const PropertyDescriptor<C>& property : properties_) setPrimer[property.key] = property.tag;

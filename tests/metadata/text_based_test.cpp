@@ -1,12 +1,12 @@
 #include <gtest/gtest.h>
 
 #include <cstdint>
-#include <functional>
 #include <memory>
 #include <string>
 #include <typeinfo>
 #include <vector>
 
+#include "core/failure.h"
 #include "metadata.h"
 #include "metadata/model_test_classes.h"
 #include "support/metadata_structural.h"
@@ -45,15 +45,6 @@ void describeText(T& object) {
   object.setTextBasedMetadataPayloadSchemeID(keyOf(schemeID));
   object.setTextMIMEMediaType(L"text/xml");
   object.setTextLanguageCode(L"en");
-}
-
-std::string failureOf(const std::function<void()>& action) {
-  try {
-    action();
-  } catch (const util::assertion_failure& failure) {
-    return failure.what();
-  }
-  return "no failure";
 }
 
 // Codes a model through the text-based composite and parses the sets back
