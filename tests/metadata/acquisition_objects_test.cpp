@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <sstream>
 #include <string>
 #include <typeinfo>
 #include <vector>
@@ -9,7 +10,9 @@
 #include "core/failure.h"
 #include "metadata.h"
 #include "metadata/model_test_classes.h"
+#include "support/klv_output.h"
 #include "support/metadata_structural.h"
+#include "support/mxf_streams.h"
 #include "support/recording.h"
 
 using namespace zelta_test;
@@ -382,4 +385,42 @@ TEST(AcquisitionDarkItems, UnknownItemOfALensSetStaysDarkAndReturns) {
   EXPECT_TRUE(run.reports().empty());
   EXPECT_EQ(bytesOf("12 34 56"), lens->getDarkProperty(acquisitionDarkItemKey(0xE123)));
   EXPECT_EQ(bytesOf("12 34 56"), codeWith(factory, lens).at(darkKey("E1 23")));
+}
+
+TEST(AcquisitionFactories, EveryClassDescribesItsWholeSetPrimer) {
+  MXFAcquisitionMetadataModelFactory composite;
+  for (const std::shared_ptr<MXFMetadataFactory>& factory : composite.getFactories()) {
+    const MetadataRootFactory& single = dynamic_cast<const MetadataRootFactory&>(*factory);
+    EXPECT_EQ(single.getSetPrimer().size(), single.getPropertyDescriptions().size()) << single.getClassName();
+  }
+  const LensUnitMetadataFactory lens;
+  const MXFPropertyDescription& attributes =
+      lens.getPropertyDescriptions().at(propertyKeyOf("0D: 03 02 03 02 02 10 01 00"));
+  EXPECT_EQ("LensUnitMetadata.lensAttributes", attributes.name);
+  EXPECT_EQ(MXFPropertyKind::narrowString, attributes.kind);
+}
+
+// Through the model coder and the set coder, the hint puts the items of a
+// camera set in table order, not in key order.
+TEST(CameraUnitMetadataFactory, CodedItemsFollowTheTableOrder) {
+  std::shared_ptr<CameraUnitMetadata> camera = CameraUnitMetadata::create();
+  camera->setCaptureGammaEquation(keyOf("06 0E 2B 34 04 01 01 01 04 01 01 01 01 01 00 00"));
+  camera->setISOSensitivity(800);
+  camera->setAutoExposureMode(keyOf("06 0E 2B 34 04 01 01 0B 05 10 01 01 01 01 00 00"));
+  std::ostringstream out;
+  GenericKLVWriter writer(out);
+  MXFMetadataCoder sets(&writer);
+  MXFMetadataModelCoder coder(&sets, std::make_shared<MXFAcquisitionMetadataModelFactory>());
+  coder.start();
+  coder.model({camera});
+  coder.end();
+  RecordingKLVHandler items;
+  readThrough(klv::outputOf(out), items);
+  std::vector<std::string> tags;
+  for (const std::string& event : items.events)
+    if (event.rfind("startLocalItem", 0) == 0) tags.push_back(event.substr(0, event.rfind(' ')));
+  EXPECT_EQ((std::vector<std::string>{
+                "startLocalItem " + std::to_string(0x3C0A), "startLocalItem " + std::to_string(0x8100),
+                "startLocalItem " + std::to_string(0x810B), "startLocalItem " + std::to_string(0x3210)}),
+            tags);
 }

@@ -425,3 +425,16 @@ TEST(TextBasedModel, FrameworkHangsOffADMSegment) {
   EXPECT_EQ(framework, segment->getDMFramework());
   EXPECT_EQ(segment, framework->getTopOwner());
 }
+
+TEST(TextBasedFactories, EveryClassDescribesItsWholeSetPrimer) {
+  MXFTextBasedDMModelFactory composite;
+  for (const std::shared_ptr<MXFMetadataFactory>& factory : composite.getFactories()) {
+    const MetadataRootFactory& single = dynamic_cast<const MetadataRootFactory&>(*factory);
+    EXPECT_EQ(single.getSetPrimer().size(), single.getPropertyDescriptions().size()) << single.getClassName();
+  }
+  const UTF8TextBasedSetFactory utf8;
+  const MXFPropertyDescription& text = utf8.getPropertyDescriptions().at(utf8Key());
+  EXPECT_EQ("UTF8TextBasedSet.utf8TextData", text.name);
+  EXPECT_EQ(MXFPropertyKind::narrowString, text.kind);
+  EXPECT_EQ(MXFPropertyKind::wideString, UTF16TextBasedSetFactory().getPropertyDescriptions().at(utf16Key()).kind);
+}
