@@ -147,6 +147,15 @@ struct PropertyKey {
   std::uint16_t tag;
 };
 
+// A property that the standard primer doesn't name: 06 0E 2B 34 01 01 01,
+// the version octet, then eight octets, with its static tag.
+inline PropertyKey formatPropertyKey(std::uint8_t version, const std::array<std::uint8_t, 8>& tail,
+                                     std::uint16_t tag) {
+  std::array<std::uint8_t, 16> octets{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, version};
+  for (std::size_t i = 0; i < tail.size(); ++i) octets[8 + i] = tail[i];
+  return PropertyKey(KLVKey(octets), tag);
+}
+
 // The set key of a class of the format: 06 0E 2B 34 02 53 01 01 0D 01 01 01 01 01,
 // the class octet, 00.
 inline KLVKey formatSetKey(std::uint8_t classOctet) {
