@@ -185,6 +185,12 @@ inline KLVKey registeredPropertyKey(std::uint8_t version, const std::array<std::
                                              item[2], item[3], item[4], item[5], item[6], item[7]});
 }
 
+// A property that the standard primer doesn't name, with its static tag.
+inline PropertyKey formatPropertyKey(std::uint8_t version, const std::array<std::uint8_t, 8>& tail,
+                                     std::uint16_t tag) {
+  return PropertyKey(registeredPropertyKey(version, tail), tag);
+}
+
 // The set key of a class of the format: 06 0E 2B 34 02 53 01 01 0D 01 01 01 01 01,
 // the class octet, 00.
 inline KLVKey formatSetKey(std::uint8_t classOctet) {

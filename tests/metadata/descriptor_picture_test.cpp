@@ -51,19 +51,6 @@ const std::string equations = "06 0E 2B 34 04 01 01 01 04 01 01 01 02 02 00 00";
 const std::string primaries = "06 0E 2B 34 04 01 01 06 04 01 01 01 03 03 00 00";
 const std::string layout = "52 08 47 08 42 08 00 00 00 00 00 00 00 00 00 00";
 
-KLVKey keyOfTag(const StaticTags& tags, std::uint16_t tag) {
-  for (const auto& entry : tags)
-    if (entry.first == tag) return entry.second;
-  return KLVKey();
-}
-
-void expectTags(const MXFKeyToTagMap& primer, const StaticTags& tags) {
-  for (const auto& tag : tags) {
-    ASSERT_EQ(1u, primer.count(tag.second)) << std::hex << tag.first;
-    EXPECT_EQ(tag.first, primer.at(tag.second)) << std::hex << tag.first;
-  }
-}
-
 // Every property of a PictureDescriptor, with the required ones of its
 // bases.
 MXFPropertyMap pictureProperties() {

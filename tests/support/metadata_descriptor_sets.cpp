@@ -1,5 +1,7 @@
 #include "support/metadata_descriptor_sets.h"
 
+#include <gtest/gtest.h>
+
 namespace zelta_test {
 
 namespace {
@@ -20,6 +22,19 @@ KLVKey propertyKeyOf(std::uint8_t version, const std::string& tail) {
   const ByteVector rest = bytesOf(tail);
   octets.insert(octets.end(), rest.begin(), rest.end());
   return KLVKey(octets.data());
+}
+
+KLVKey keyOfTag(const StaticTags& tags, std::uint16_t tag) {
+  for (const auto& entry : tags)
+    if (entry.first == tag) return entry.second;
+  return KLVKey();
+}
+
+void expectTags(const MXFKeyToTagMap& primer, const StaticTags& tags) {
+  for (const auto& tag : tags) {
+    ASSERT_EQ(1u, primer.count(tag.second)) << std::hex << tag.first;
+    EXPECT_EQ(tag.first, primer.at(tag.second)) << std::hex << tag.first;
+  }
 }
 
 MXFParsedObject parseWith(MetadataRootFactory& factory, const MXFPropertyMap& properties,

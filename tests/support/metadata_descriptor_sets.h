@@ -22,9 +22,24 @@ KLVKey propertyKeyOf(std::uint8_t version, const std::string& tail);
 // A static tag and its property key.
 typedef std::vector<std::pair<std::uint16_t, KLVKey>> StaticTags;
 
+// The key of a tag among them; a default key when it isn't there.
+KLVKey keyOfTag(const StaticTags& tags, std::uint16_t tag);
+
+// Expects each of the tags under its key in a set primer.
+void expectTags(const MXFKeyToTagMap& primer, const StaticTags& tags);
+
 // One set through a class factory whose reports go to errors.
 MXFParsedObject parseWith(MetadataRootFactory& factory, const MXFPropertyMap& properties,
                           const std::shared_ptr<RecordingErrorHandler>& errors);
+
+// The same through a new factory, as the factory's class; null when the
+// factory made something else.
+template <typename Factory, typename Object>
+std::shared_ptr<Object> parsedAs(const MXFPropertyMap& properties,
+                                 const std::shared_ptr<RecordingErrorHandler>& errors) {
+  Factory factory;
+  return std::dynamic_pointer_cast<Object>(parseWith(factory, properties, errors).object);
+}
 
 // Each report as "error 2 missing X": severity, octet 3 of the identifier,
 // message.

@@ -109,15 +109,19 @@ std::string objectDifference(MXFMetadataFactory& factory, const std::shared_ptr<
   return {};
 }
 
+std::shared_ptr<MXFMetadataModelFactory> formatFactory() { return std::make_shared<MXFFormatMetadataModelFactory>(); }
+
 }  // namespace
 
-HeaderModel readHeaderModel(const std::string& name) {
+HeaderModel readHeaderModel(const std::string& name) { return readHeaderModel(name, formatFactory); }
+
+HeaderModel readHeaderModel(const std::string& name, const ModelFactoryMaker& makeFactory) {
   HeaderModel result;
   RecordingErrorHandler readerErrors;
   PartitionCounter counter(result.partitions);
   HeaderModelKeeper keeper(result);
   auto modelErrors = std::make_shared<KeptReports>(result.modelReports, &result.partitions);
-  auto factory = std::make_shared<MXFFormatMetadataModelFactory>();
+  const std::shared_ptr<MXFMetadataModelFactory> factory = makeFactory();
   factory->setErrorHandler(modelErrors);
   MXFMetadataModelParser modelParser(&keeper, factory);
   modelParser.setErrorHandler(modelErrors.get());
@@ -137,13 +141,15 @@ HeaderModel readHeaderModel(const std::string& name) {
   return result;
 }
 
-RewrittenModel rewriteModel(const MXFMetadataModel& model) {
+RewrittenModel rewriteModel(const MXFMetadataModel& model) { return rewriteModel(model, formatFactory); }
+
+RewrittenModel rewriteModel(const MXFMetadataModel& model, const ModelFactoryMaker& makeFactory) {
   RewrittenModel result;
   std::ostringstream out;
   {
     GenericKLVWriter writer(out);
     MXFMetadataCoder metadataCoder(&writer);
-    MXFMetadataModelCoder modelCoder(&metadataCoder, std::make_shared<MXFFormatMetadataModelFactory>());
+    MXFMetadataModelCoder modelCoder(&metadataCoder, makeFactory());
     modelCoder.start();
     modelCoder.model(model);
     modelCoder.end();
@@ -152,7 +158,7 @@ RewrittenModel rewriteModel(const MXFMetadataModel& model) {
   result.bytes.assign(octets.begin(), octets.end());
 
   auto errors = std::make_shared<KeptReports>(result.reports);
-  auto factory = std::make_shared<MXFFormatMetadataModelFactory>();
+  const std::shared_ptr<MXFMetadataModelFactory> factory = makeFactory();
   factory->setErrorHandler(errors);
   ModelKeeper keeper(result.model);
   MXFMetadataModelParser modelParser(&keeper, factory);
@@ -168,8 +174,13 @@ RewrittenModel rewriteModel(const MXFMetadataModel& model) {
 }
 
 std::string modelDifference(const MXFMetadataModel& expected, const MXFMetadataModel& actual) {
-  if (expected.size() != actual.size()) return "number of roots";
   MXFFormatMetadataModelFactory factory;
+  return modelDifference(expected, actual, factory);
+}
+
+std::string modelDifference(const MXFMetadataModel& expected, const MXFMetadataModel& actual,
+                            MXFMetadataFactory& factory) {
+  if (expected.size() != actual.size()) return "number of roots";
   for (std::size_t index = 0; index < expected.size(); ++index) {
     const std::string difference = objectDifference(factory, expected[index], actual[index], "");
     if (!difference.empty()) return difference;

@@ -3,6 +3,8 @@
 #ifndef ZELTA_TESTS_SUPPORT_MODEL_READING_H
 #define ZELTA_TESTS_SUPPORT_MODEL_READING_H
 
+#include <functional>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -26,6 +28,12 @@ struct HeaderModel {
 // format's composite factory.
 HeaderModel readHeaderModel(const std::string& name);
 
+// Makes a fresh composite factory for each parser and coder.
+typedef std::function<std::shared_ptr<MXFMetadataModelFactory>()> ModelFactoryMaker;
+
+// The same through another composite.
+HeaderModel readHeaderModel(const std::string& name, const ModelFactoryMaker& makeFactory);
+
 // A model written by MXFMetadataModelCoder and MXFMetadataCoder into a KLV
 // stream in memory, and read back by MXFMetadataParser and
 // MXFMetadataModelParser.
@@ -36,12 +44,15 @@ struct RewrittenModel {
 };
 
 RewrittenModel rewriteModel(const MXFMetadataModel& model);
+RewrittenModel rewriteModel(const MXFMetadataModel& model, const ModelFactoryMaker& makeFactory);
 
 // Empty when two models are equal object by object: same classes, same coded
 // properties (dark ones included, each reference as its identifier), and the
 // same owned objects in the same order, recursively. Otherwise where the
 // first difference is.
 std::string modelDifference(const MXFMetadataModel& expected, const MXFMetadataModel& actual);
+std::string modelDifference(const MXFMetadataModel& expected, const MXFMetadataModel& actual,
+                            MXFMetadataFactory& factory);
 
 }  // namespace zelta_test
 
