@@ -179,6 +179,37 @@ TEST(CodecDescriptorFiles, BmxH264HasTwoWaveDescriptors) {
   EXPECT_EQ(24, sounds[0]->getContainerDuration());
 }
 
+// The DV files' two 16-bit mono sounds at 48 kHz: two octets a sample.
+// bmx/op1a_dv25_625_bodypart_part4.mxf.mxfdump.txt, bmx/op1a_dv25_625_singlepass.mxf.mxfdump.txt and
+// gst/dv25_625_420_2mono.mxf.mxfdump.txt (MXFWaveAudioDescriptor, container 06 01 00),
+// ffmpeg/dv25_625_420_2mono.mxf.mxfdump.txt (MXFAES3PCMDescriptor, container 06 03 00): AudioSamplingRate
+// 00 00 bb 80 / 1, ChannelCount 1, QuantizationBits 0x10, BlockAlign 2, AvgBps 0x017700.
+TEST(CodecDescriptorFiles, DVFilesHaveTwoSixteenBitMonoSoundDescriptors) {
+  struct File {
+    const char* name;
+    bool aes3;
+  };
+  for (const File& file :
+       {File{"bmx_op1a_dv25_625_bodypart_part4.mxf", false}, File{"bmx_op1a_dv25_625_singlepass.mxf", false},
+        File{"gst_dv25_625_420_2mono.mxf", false}, File{"ffmpeg_dv25_625_420_2mono.mxf", true}}) {
+    SCOPED_TRACE(file.name);
+    const MXFMetadataModel model = codecModelOf(file.name);
+    std::vector<std::shared_ptr<const WaveAudioDescriptor>> sounds;
+    for (const auto& d : objectsOf<WaveAudioDescriptor>(model)) sounds.push_back(d);
+    for (const auto& d : objectsOf<AES3AudioDescriptor>(model)) sounds.push_back(d);
+    EXPECT_EQ(file.aes3 ? 2u : 0u, objectsOf<AES3AudioDescriptor>(model).size());
+    ASSERT_EQ(2u, sounds.size());
+    for (const std::shared_ptr<const WaveAudioDescriptor>& d : sounds) {
+      EXPECT_EQ(keyOf(file.aes3 ? aes3Container : waveContainer), d->getEssenceContainer());
+      EXPECT_EQ((MXFRational{48000, 1}), d->getAudioSamplingRate());
+      EXPECT_EQ(1u, d->getChannelCount());
+      EXPECT_EQ(16u, d->getQuantizationBits());
+      EXPECT_EQ(2u, d->getBlockAlign());
+      EXPECT_EQ(96000u, d->getAverageBytesPerSecond());
+    }
+  }
+}
+
 // Every file read with the codec composites codes again and reads back to
 // the same model.
 TEST(CodecDescriptorFiles, ModelsWithCodecDescriptorsSurviveTheModelCoderAndParser) {
