@@ -6,6 +6,7 @@
 #include <typeinfo>
 #include <variant>
 
+#include "kit.h"
 #include "model.h"
 #include "summary.h"
 
@@ -250,7 +251,7 @@ ModelObject renderObject(MXFMetadataModelFactory& factory, const std::shared_ptr
 Model buildModel(const Metadata& metadata, ErrorHandler& reports) {
   // The factory keeps its handler weakly; this one lives as long as the parse.
   const std::shared_ptr<ErrorHandler> handler(&reports, [](ErrorHandler*) {});
-  const std::shared_ptr<MXFMetadataModelFactory> factory = std::make_shared<MXFFormatMetadataModelFactory>();
+  const std::shared_ptr<MXFMetadataModelFactory> factory = createZeltaDefaultMetadataFactory();
   factory->setErrorHandler(handler);
   ModelKeeper keeper;
   MXFMetadataModelParser parser(&keeper, factory);
