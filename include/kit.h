@@ -1,9 +1,10 @@
 // Zelta: the kit layer, one header of sub-headers: the master metadata and
-// the kit's identity, the metadata factory, and the model builder.
+// the kit's identity, the metadata factory, the model builder, and the reader.
 #ifndef ZELTA_KIT_H
 #define ZELTA_KIT_H
 
 #include "kit_builder.h"
+#include "kit_reader.h"
 #include "kit_factory.h"
 #include "kit_master.h"
 

@@ -29,36 +29,6 @@ KLVKey setKey(std::uint8_t kind, std::uint8_t count) {
   return key;
 }
 
-// " tag=octets;tag=octets;", tags in decimal; nothing for no items.
-std::string itemsText(const MXFGCLocalItems& items) {
-  std::string text;
-  for (const auto& [tag, bytes] : items) text += std::to_string(tag) + "=" + hexOf(bytes) + ";";
-  return text.empty() ? text : " " + text;
-}
-
-// One line per event; the packs are kept whole.
-class RecordingSDTICPHandler : public MXFSDTICPSystemHandler {
-public:
-  void systemMetadata(const MXFSDTICPSystemMetadata& pack) override {
-    events.push_back("systemMetadata " + std::to_string(pack.continuityCount));
-    packs.push_back(pack);
-  }
-  void packageMetadata(const MXFGCLocalItems& items) override {
-    events.push_back("packageMetadata" + itemsText(items));
-  }
-  void pictureMetadata(const MXFGCLocalItems& items) override {
-    events.push_back("pictureMetadata" + itemsText(items));
-  }
-  void soundMetadata(const MXFGCLocalItems& items) override { events.push_back("soundMetadata" + itemsText(items)); }
-  void dataMetadata(const MXFGCLocalItems& items) override { events.push_back("dataMetadata" + itemsText(items)); }
-  void controlData(std::uint16_t tag, const ByteVector& bytes) override {
-    events.push_back("controlData " + std::to_string(tag) + "=" + hexOf(bytes));
-  }
-
-  std::vector<std::string> events;
-  std::vector<MXFSDTICPSystemMetadata> packs;
-};
-
 MXFSDTICPSystemMetadata samplePack(std::uint8_t bitmap, std::uint16_t continuityCount) {
   MXFSDTICPSystemMetadata pack;
   pack.bitmap = bitmap;
@@ -88,7 +58,7 @@ ByteVector packBytes(std::uint8_t bitmap, std::uint16_t continuityCount) {
 }
 
 class MXFSDTICPSystemParserTest : public ::testing::Test {
-protected:
+ protected:
   MXFSDTICPSystemParserTest() { parser.setErrorHandler(&errors); }
 
   void pack(std::uint8_t bitmap, std::uint16_t continuityCount = 0) {

@@ -68,8 +68,7 @@ bool RecordingGCHandler::startEssenceElement(const KLVKey& key, std::uint64_t le
   return essencePolicy != decline;
 }
 
-void RecordingGCHandler::element(const char* kind, const KLVKey& key, const std::uint8_t* data,
-                                 std::uint64_t length) {
+void RecordingGCHandler::element(const char* kind, const KLVKey& key, const std::uint8_t* data, std::uint64_t length) {
   events.push_back(std::string(kind) + "Element " + toString(key) + " " + std::to_string(length));
   Element e{kind, key, data, length, ByteVector()};
   if (data) e.bytes.assign(data, data + length);
@@ -154,6 +153,37 @@ bool sendVariableLengthPack(KLVHandler& handler, const KLVKey& key, const MXFGCV
   }
   handler.endVariableLengthPack(key);
   return taken;
+}
+
+namespace {
+
+// " tag=octets;tag=octets;", tags in decimal; nothing for no items.
+std::string itemsText(const MXFGCLocalItems& items) {
+  std::string text;
+  for (const auto& [tag, bytes] : items) text += std::to_string(tag) + "=" + hexOf(bytes) + ";";
+  return text.empty() ? text : " " + text;
+}
+
+}  // namespace
+
+void RecordingSDTICPHandler::systemMetadata(const MXFSDTICPSystemMetadata& pack) {
+  events.push_back("systemMetadata " + std::to_string(pack.continuityCount));
+  packs.push_back(pack);
+}
+void RecordingSDTICPHandler::packageMetadata(const MXFGCLocalItems& items) {
+  events.push_back("packageMetadata" + itemsText(items));
+}
+void RecordingSDTICPHandler::pictureMetadata(const MXFGCLocalItems& items) {
+  events.push_back("pictureMetadata" + itemsText(items));
+}
+void RecordingSDTICPHandler::soundMetadata(const MXFGCLocalItems& items) {
+  events.push_back("soundMetadata" + itemsText(items));
+}
+void RecordingSDTICPHandler::dataMetadata(const MXFGCLocalItems& items) {
+  events.push_back("dataMetadata" + itemsText(items));
+}
+void RecordingSDTICPHandler::controlData(std::uint16_t tag, const ByteVector& bytes) {
+  events.push_back("controlData " + std::to_string(tag) + "=" + hexOf(bytes));
 }
 
 }  // namespace zelta_test

@@ -21,7 +21,7 @@ std::string hexOf(const ByteVector& bytes);
 // "startEssenceElement <key> <length>", "pictureElement <key> <length>"
 // (sound, data, compound alike).
 class RecordingGCHandler : public MXFGCStructureHandler, public MXFGCSystemHandler, public MXFGCEssenceHandler {
-public:
+ public:
   enum EssencePolicy {
     decline,        // startEssenceElement answers false
     take,           // true, with no buffer: the splitter's own buffer is used
@@ -74,8 +74,24 @@ public:
   // long as the handler.
   std::vector<std::vector<std::uint8_t>> buffers;
 
-private:
+ private:
   void element(const char* kind, const KLVKey& key, const std::uint8_t* data, std::uint64_t length);
+};
+
+// One line per SDTI-CP event ("systemMetadata <continuity count>",
+// "packageMetadata tag=octets;...", "controlData tag=octets"); the packs are
+// kept whole.
+class RecordingSDTICPHandler : public MXFSDTICPSystemHandler {
+ public:
+  void systemMetadata(const MXFSDTICPSystemMetadata& pack) override;
+  void packageMetadata(const MXFGCLocalItems& items) override;
+  void pictureMetadata(const MXFGCLocalItems& items) override;
+  void soundMetadata(const MXFGCLocalItems& items) override;
+  void dataMetadata(const MXFGCLocalItems& items) override;
+  void controlData(std::uint16_t tag, const ByteVector& bytes) override;
+
+  std::vector<std::string> events;
+  std::vector<MXFSDTICPSystemMetadata> packs;
 };
 
 // Events as GenericKLVReader sends them: the value is put into a buffer that
