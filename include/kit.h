@@ -1,11 +1,13 @@
 // Zelta: the kit layer, one header of sub-headers: the master metadata and
-// the kit's identity, the metadata factory, the model builder, and the reader.
+// the kit's identity, the metadata factory, the model builder and master extraction, and the
+// reader.
 #ifndef ZELTA_KIT_H
 #define ZELTA_KIT_H
 
 #include "kit_builder.h"
-#include "kit_reader.h"
+#include "kit_extraction.h"
 #include "kit_factory.h"
 #include "kit_master.h"
+#include "kit_reader.h"
 
 #endif

@@ -37,6 +37,10 @@ inline constexpr KLVKey proxyPictureCoding = registryLabel(0x03, {0x04, 0x01, 0x
 inline constexpr KLVKey proxySoundCompression = registryLabel(0x03, {0x04, 0x02, 0x02, 0x02, 0x03, 0x01, 0x01, 0x00});
 inline constexpr KLVKey avcSoundCompression = registryLabel(0x0A, {0x04, 0x02, 0x02, 0x01, 0x01, 0x00, 0x00, 0x00});
 
+// What the extraction answers for the bit rate of a proxy picture, whose
+// descriptor holds none.
+inline constexpr std::uint32_t proxyBitRate = 1500000;
+
 // Proxy sound: eight channels in four stereo tracks of 8 bits.
 inline constexpr std::uint32_t proxyChannelsPerTrack = 2;
 inline constexpr std::uint32_t proxyQuantizationBits = 8;

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "kit/essence_formats.h"
+#include "kit/model_labels.h"
 
 namespace zelta_test {
 
@@ -91,19 +92,31 @@ void setMPEG(ZeltaDefaultMetadata& m, const MasterShape& shape) {
   m.subsampling = m.rgb ? ZeltaSize(1, 1) : ZeltaSize(2, 1);
 }
 
+// The full size AVC picture is described by its coding label alone: High
+// 4:2:2 intra, whose class labels name 100 Mbit/s for 1080 lines at
+// 24000/1001 and 50 frames and for fields at 25 and 30000/1001; at other
+// rates the label names no bit rate. Its level is read back as the lowest
+// Simple Studio level of the picture: 228 for 1920x1080 at 50 frames and
+// more, else 226.
+void setFullSizeAVC(ZeltaDefaultMetadata& m, const MasterShape& shape) {
+  setHD(m, shape);
+  const MXFRational& rate = shape.editRate;
+  const bool classed = isRate(rate, 24000, 1001) || isRate(rate, 50, 1) || is625(rate) || is525(rate);
+  const bool fast = m.progressive && rate.numerator / rate.denominator >= 50;
+  m.bitRate = classed ? 100000000 : 0;
+  m.profileAndLevel = static_cast<std::uint16_t>((122 << 8) | (fast ? 228 : 226));
+  m.profileConstraint = 16;
+}
+
 void setAVC(ZeltaDefaultMetadata& m, const MasterShape& shape) {
   m.componentDepth = 10;
   m.subsampling = {2, 1};
-  m.closedGOP = true;
   m.aspectRatio = {16, 9};
   if (shape.picture == PictureKind::fullSize) {
-    setHD(m, shape);
-    m.bitRate = 100000000;
-    m.maxGOP = 1;
-    m.profileAndLevel = (122 << 8) | 41;
-    m.profileConstraint = 16;
+    setFullSizeAVC(m, shape);
     return;
   }
+  m.closedGOP = true;
   m.progressive = true;
   m.displaySize = {1280, 720};
   m.videoLineMap = {26, 0};
@@ -122,6 +135,7 @@ void setRaw(ZeltaDefaultMetadata& m) {
 }
 
 void setProxy(ZeltaDefaultMetadata& m, const MasterShape& shape) {
+  m.bitRate = zelta::proxyBitRate;
   m.progressive = false;
   m.displaySize = {352, is625(shape.editRate) ? 288u : 240u};
   m.aspectRatio = is525(shape.editRate) ? MXFRational{4, 3} : MXFRational{16, 9};
@@ -217,7 +231,8 @@ std::vector<MasterShape> masterDomain() {
           for (bool sound : {false, true}) {
             if (!sound && !soundOptional) continue;
             for (bool ancillary : {false, true}) {
-              if (ancillary && !ancillaryOptional) continue;
+              // DV always carries its data track.
+              if (format == ZeltaEssenceFormat::DV ? !ancillary : ancillary && !ancillaryOptional) continue;
               MasterShape shape;
               shape.format = format;
               shape.editRate = rate;

@@ -1,7 +1,8 @@
 // Masters over the whole domain of the model builder: every essence format
 // at every edit rate it allows, both Preface versions, with and without
 // sound and ancillary data where the format allows them, and the picture
-// kinds of the formats that have several. Each master holds the values that
+// kinds of the formats that have several. DV masters say that they carry
+// ancillary data, as every DV file does. Each master holds the values that
 // its built model shows, so that a model made of it gives it back.
 #ifndef ZELTA_TESTS_SUPPORT_KIT_MASTERS_H
 #define ZELTA_TESTS_SUPPORT_KIT_MASTERS_H
