@@ -13,7 +13,7 @@ namespace {
 using namespace zelta_info;
 
 const char* const usage =
-    "usage: zelta-info [--json] [--sets] [--index] [--essence [--md5]] [--system] [--model] FILE\n"
+    "usage: zelta-info [--json] [--sets] [--index] [--essence [--md5]] [--system] [--model] [--master] FILE\n"
     "       zelta-info --copy OUT FILE\n"
     "\n"
     "Reads the MXF file FILE (a run-in is skipped) and prints each partition\n"
@@ -25,7 +25,7 @@ const char* const usage =
     "  --json   print one JSON object instead (file, result, runIn, partitions,\n"
     "           randomIndex, metadata with --sets, index with --index,\n"
     "           essence with --essence, system with --system, model with\n"
-    "           --model, reports)\n"
+    "           --model, master with --master, reports)\n"
     "  --sets   also print the primer and the primed sets (set key, property\n"
     "           keys and sizes) of each partition's header metadata\n"
     "  --index  also print every index table segment with its fields, delta\n"
@@ -61,7 +61,8 @@ const char* const usage =
     "in JSON.\n"
     "\n"
     "Exit status: 0 when the read ended normally, 1 when a fatal error stopped\n"
-    "it, 2 on a usage error (no file, unreadable file).\n";
+    "it or --master found no master, 2 on a usage error (no file, unreadable\n"
+    "file).\n";
 
 struct Options {
   bool json = false;
@@ -73,7 +74,9 @@ struct Options {
 // The model of the first header metadata that the read met, however far
 // it went.
 void collectModel(Summary& summary, const Details& details, ErrorHandler& reports) {
-  if (details.model && !summary.metadata.empty()) summary.model = buildModel(summary.metadata.front(), reports);
+  if ((details.model || details.master) && !summary.metadata.empty())
+    summary.model = buildModel(summary.metadata.front(), reports);
+  if (details.master) summary.master = extractMaster(summary.model);
 }
 
 // Reads the whole file; false when a fatal error stopped the read.
@@ -87,7 +90,7 @@ bool readFile(std::istream& in, Summary& summary, const Details& details) {
   MXFIndexParser indexParser(&indexCollector);
   indexParser.setErrorHandler(&reporter);
   SectionCounter metadata(summary, metadataSection,
-                          details.sets || details.model ? static_cast<KLVHandler*>(&setParser) : &skipper);
+                          details.sets || details.model || details.master ? static_cast<KLVHandler*>(&setParser) : &skipper);
   SectionCounter index(summary, indexSection, details.index ? static_cast<KLVHandler*>(&indexParser) : &skipper);
   SystemCollector systemCollector(summary.system, &reporter);
   EssenceCollector essenceCollector(details.essence ? &summary.essence : nullptr, details.md5,
@@ -163,6 +166,8 @@ bool parseOptions(int argc, char** argv, Options& options) {
       options.details.system = true;
     } else if (std::strcmp(argv[i], "--model") == 0) {
       options.details.model = true;
+    } else if (std::strcmp(argv[i], "--master") == 0) {
+      options.details.master = true;
     } else if (std::strcmp(argv[i], "--copy") == 0 && i + 1 < argc) {
       options.copyTo = argv[++i];
     } else if (argv[i][0] == '-' || !options.file.empty()) {
@@ -200,5 +205,5 @@ int main(int argc, char** argv) {
     printJson(std::cout, options.file, !ok, summary, options.details);
   else
     printText(std::cout, summary, options.details);
-  return ok ? 0 : 1;
+  return ok && summary.master.failure.empty() ? 0 : 1;
 }

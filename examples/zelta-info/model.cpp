@@ -41,8 +41,6 @@ MetadataRootFactory* classFactory(MXFMetadataModelFactory& composite, const std:
   return nullptr;
 }
 
-ModelValue literalValue(const std::string& text) { return ModelValue{ModelValue::literal, text, {}, nullptr}; }
-ModelValue textValue(const std::string& text) { return ModelValue{ModelValue::text, text, {}, nullptr}; }
 
 template <typename T>
 T decoded(const ByteVector& octets) {
@@ -65,49 +63,9 @@ ModelValue numberList(const ByteVector& octets) {
   return list;
 }
 
-std::string keyText(const KLVKey& key) {
-  std::ostringstream out;
-  out << key;
-  return out.str();
-}
 
-std::string timestampText(const MXFTimestamp& t) {
-  char text[32];
-  std::snprintf(text, sizeof text, "%04u-%02u-%02u %02u:%02u:%02u.%03u", unsigned(t.year), unsigned(t.month),
-                unsigned(t.day), unsigned(t.hour), unsigned(t.minute), unsigned(t.second),
-                unsigned(t.quarterMillisecond) * 4);
-  return text;
-}
 
-std::string versionText(const MXFProductVersion& v) {
-  return std::to_string(v.major) + "." + std::to_string(v.minor) + "." + std::to_string(v.tertiary) + "." +
-         std::to_string(v.patch) + "." + std::to_string(v.release);
-}
 
-// Code points to UTF-8; what is no scalar value becomes U+FFFD.
-std::string utf8Text(const std::wstring& text) {
-  std::string out;
-  for (wchar_t c : text) {
-    std::uint32_t p = static_cast<std::uint32_t>(c);
-    if (p > 0x10FFFF || (p >= 0xD800 && p < 0xE000)) p = 0xFFFD;
-    if (p < 0x80) {
-      out += static_cast<char>(p);
-    } else if (p < 0x800) {
-      out += static_cast<char>(0xC0 | (p >> 6));
-      out += static_cast<char>(0x80 | (p & 0x3F));
-    } else if (p < 0x10000) {
-      out += static_cast<char>(0xE0 | (p >> 12));
-      out += static_cast<char>(0x80 | ((p >> 6) & 0x3F));
-      out += static_cast<char>(0x80 | (p & 0x3F));
-    } else {
-      out += static_cast<char>(0xF0 | (p >> 18));
-      out += static_cast<char>(0x80 | ((p >> 12) & 0x3F));
-      out += static_cast<char>(0x80 | ((p >> 6) & 0x3F));
-      out += static_cast<char>(0x80 | (p & 0x3F));
-    }
-  }
-  return out;
-}
 
 ModelValue referenceValue(MXFMetadataModelFactory& factory, const MXFUID& target, const OwnedObjects& owned) {
   const OwnedObjects::const_iterator found = owned.find(target);
@@ -266,7 +224,56 @@ Model buildModel(const Metadata& metadata, ErrorHandler& reports) {
   model.partition = metadata.partition;
   for (const std::shared_ptr<MetadataRoot>& object : keeper.objects())
     model.objects.push_back(renderObject(*factory, object));
+  if (!keeper.objects().empty()) model.preface = std::dynamic_pointer_cast<const Preface>(keeper.objects().front());
   return model;
+}
+
+ModelValue literalValue(const std::string& text) { return ModelValue{ModelValue::literal, text, {}, nullptr}; }
+
+ModelValue textValue(const std::string& text) { return ModelValue{ModelValue::text, text, {}, nullptr}; }
+
+std::string keyText(const KLVKey& key) {
+  std::ostringstream out;
+  out << key;
+  return out.str();
+}
+
+std::string timestampText(const MXFTimestamp& t) {
+  char text[32];
+  std::snprintf(text, sizeof text, "%04u-%02u-%02u %02u:%02u:%02u.%03u", unsigned(t.year), unsigned(t.month),
+                unsigned(t.day), unsigned(t.hour), unsigned(t.minute), unsigned(t.second),
+                unsigned(t.quarterMillisecond) * 4);
+  return text;
+}
+
+std::string versionText(const MXFProductVersion& v) {
+  return std::to_string(v.major) + "." + std::to_string(v.minor) + "." + std::to_string(v.tertiary) + "." +
+         std::to_string(v.patch) + "." + std::to_string(v.release);
+}
+
+// Code points to UTF-8; what is no scalar value becomes U+FFFD.
+std::string utf8Text(const std::wstring& text) {
+  std::string out;
+  for (wchar_t c : text) {
+    std::uint32_t p = static_cast<std::uint32_t>(c);
+    if (p > 0x10FFFF || (p >= 0xD800 && p < 0xE000)) p = 0xFFFD;
+    if (p < 0x80) {
+      out += static_cast<char>(p);
+    } else if (p < 0x800) {
+      out += static_cast<char>(0xC0 | (p >> 6));
+      out += static_cast<char>(0x80 | (p & 0x3F));
+    } else if (p < 0x10000) {
+      out += static_cast<char>(0xE0 | (p >> 12));
+      out += static_cast<char>(0x80 | ((p >> 6) & 0x3F));
+      out += static_cast<char>(0x80 | (p & 0x3F));
+    } else {
+      out += static_cast<char>(0xF0 | (p >> 18));
+      out += static_cast<char>(0x80 | ((p >> 12) & 0x3F));
+      out += static_cast<char>(0x80 | ((p >> 6) & 0x3F));
+      out += static_cast<char>(0x80 | (p & 0x3F));
+    }
+  }
+  return out;
 }
 
 }  // namespace zelta_info

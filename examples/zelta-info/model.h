@@ -45,11 +45,22 @@ struct Model {
   bool present = false;
   std::uint64_t partition = 0;  // the offset of the partition that held it
   std::vector<ModelObject> objects;
+  std::shared_ptr<const Preface> preface;  // the root, when it is a Preface
 };
 
 // Text forms of values, shared by the model's printers and its tests.
 std::string identifierText(const MXFUID& id);  // 8-4-4-4-12 lower-case digits
 std::string hexText(const ByteVector& octets);  // lower-case digits, no separator
+std::string keyText(const KLVKey& key);
+std::string timestampText(const MXFTimestamp& t);  // 2026-11-24 10:00:00.000
+std::string versionText(const MXFProductVersion& v);  // major.minor.tertiary.patch.release
+std::string utf8Text(const std::wstring& text);  // what is no scalar value becomes U+FFFD
+ModelValue literalValue(const std::string& text);
+ModelValue textValue(const std::string& text);
+
+// Named values, as the model's objects print them.
+void printNamedText(std::ostream& out, const NamedValues& values, const std::string& indent);
+void printNamedJson(std::ostream& out, const NamedValues& values);
 
 // Shows one object and everything that it owns, through the class factories
 // of the composite.

@@ -77,14 +77,6 @@ void printValueJson(std::ostream& out, const ModelValue& value) {
   out << "]";
 }
 
-void printNamedJson(std::ostream& out, const NamedValues& values) {
-  out << "{";
-  for (std::size_t i = 0; i < values.size(); ++i) {
-    out << (i ? ", " : "") << jsonString(values[i].first) << ": ";
-    printValueJson(out, values[i].second);
-  }
-  out << "}";
-}
 
 void printObjectJson(std::ostream& out, const ModelObject& object) {
   out << "{\"class\": " << jsonString(object.className) << ", \"instanceUID\": " << jsonString(object.instanceUID);
@@ -97,6 +89,19 @@ void printObjectJson(std::ostream& out, const ModelObject& object) {
 }
 
 }  // namespace
+
+void printNamedJson(std::ostream& out, const NamedValues& values) {
+  out << "{";
+  for (std::size_t i = 0; i < values.size(); ++i) {
+    out << (i ? ", " : "") << jsonString(values[i].first) << ": ";
+    printValueJson(out, values[i].second);
+  }
+  out << "}";
+}
+
+void printNamedText(std::ostream& out, const NamedValues& values, const std::string& indent) {
+  for (const NamedValues::value_type& value : values) printValueText(out, value.first, value.second, indent);
+}
 
 void printModelText(std::ostream& out, const Model& model) {
   if (!model.present) {

@@ -204,6 +204,7 @@ void printText(std::ostream& out, const Summary& s, const Details& details) {
   if (details.essence) printEssenceText(out, s.essence);
   if (details.system) printSystemText(out, s.system);
   if (details.model) printModelText(out, s.model);
+  if (details.master) printMasterText(out, s.master);
 }
 
 void printJson(std::ostream& out, const std::string& file, bool fatal, const Summary& s, const Details& details) {
@@ -248,6 +249,10 @@ void printJson(std::ostream& out, const std::string& file, bool fatal, const Sum
   if (details.model) {
     out << ", \"model\": ";
     printModelJson(out, s.model);
+  }
+  if (details.master) {
+    out << ", \"master\": ";
+    printMasterJson(out, s.master);
   }
   out << ", \"reports\": [";
   for (std::size_t i = 0; i < s.reports.size(); ++i)

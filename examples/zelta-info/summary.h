@@ -10,6 +10,7 @@
 
 #include "essence.h"
 #include "klv.h"
+#include "master.h"
 #include "model.h"
 #include "mxf.h"
 
@@ -58,6 +59,7 @@ struct Summary {
   Essence essence;
   SystemItems system;
   Model model;
+  Master master;
   std::vector<Report> reports;
   std::uint64_t suppressed = 0;  // reports neither kept nor echoed
 };
@@ -167,6 +169,7 @@ struct Details {
   bool md5 = false;
   bool system = false;
   bool model = false;
+  bool master = false;
 };
 
 // Text forms shared by the printers.
