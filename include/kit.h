@@ -9,5 +9,6 @@
 #include "kit_factory.h"
 #include "kit_master.h"
 #include "kit_reader.h"
+#include "kit_validation.h"
 
 #endif

@@ -275,14 +275,20 @@ std::uint32_t getDVBitRate(const KLVKey& label) {
   return 4 * dvBitRate;
 }
 
-ZeltaEssenceFormat getEssenceFormat(const KLVKey& container) {
+std::optional<ZeltaEssenceFormat> findEssenceFormat(const KLVKey& container) {
   if (isD10Container(container)) return ZeltaEssenceFormat::D10;
   if (isDVContainer(container)) return ZeltaEssenceFormat::DV;
   if (container == mpegContainer) return ZeltaEssenceFormat::MPEG;
   if (container == proxyContainer) return ZeltaEssenceFormat::Proxy;
   if (container == rawContainer) return ZeltaEssenceFormat::Raw;
-  check(container == avcContainer || container == avcOlderContainer, "recognized essence container");
-  return ZeltaEssenceFormat::AVC;
+  if (container == avcContainer || container == avcOlderContainer) return ZeltaEssenceFormat::AVC;
+  return std::nullopt;
+}
+
+ZeltaEssenceFormat getEssenceFormat(const KLVKey& container) {
+  const std::optional<ZeltaEssenceFormat> format = findEssenceFormat(container);
+  check(format.has_value(), "recognized essence container");
+  return *format;
 }
 
 }  // namespace zelta

@@ -5,6 +5,7 @@
 #define ZELTA_KIT_ESSENCE_FORMATS_H
 
 #include <cstdint>
+#include <optional>
 #include <vector>
 
 #include "kit.h"
@@ -63,6 +64,8 @@ std::uint32_t getD10BitRate(const KLVKey& label);
 std::uint32_t getDVBitRate(const KLVKey& label);
 // The format of a picture's container ("recognized essence container").
 ZeltaEssenceFormat getEssenceFormat(const KLVKey& container);
+// The same, or nothing for a container of no format of the kit.
+std::optional<ZeltaEssenceFormat> findEssenceFormat(const KLVKey& container);
 
 }  // namespace zelta
 

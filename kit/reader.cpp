@@ -6,6 +6,9 @@
 #include "kit/essence_splitter.h"
 #include "kit/metadata_parser.h"
 #include "kit/system_parser.h"
+#include "kit/validators/index_validator.h"
+#include "kit/validators/structure_validator.h"
+#include "kit/validators/system_validator.h"
 
 namespace {
 
@@ -55,8 +58,29 @@ class ReadChain {
     if (errors_) reader_.setErrorHandler(errors_);
   }
 
+  // With an error handler, a validator in front of each handler of the
+  // structure, metadata, index and SDTI-CP events, all sharing one cross
+  // validator. The metadata validator is still to come: its handler hears
+  // the parser directly.
+  void validate(MXFStructureHandler* structure, ZeltaMetadataHandler* metadata, MXFIndexHandler* index,
+                MXFSDTICPSystemHandler* sdticp) {
+    if (!errors_ || !(structure || metadata || index || sdticp)) return;
+    cross_.emplace();
+    cross_->setErrorHandler(errors_);
+    if (structure) {
+      structureValidator_.emplace(structure, &*cross_);
+      structureValidator_->setErrorHandler(errors_);
+    }
+    if (index) indexValidator_.emplace(index, &*cross_);
+    if (sdticp) {
+      systemValidator_.emplace(sdticp, &*cross_);
+      systemValidator_->setErrorHandler(errors_);
+    }
+  }
+
   void structure(MXFStructureHandler* handler) {
-    if (handler) reader_.setStructureHandler(handler);
+    if (!handler) return;
+    reader_.setStructureHandler(structureValidator_ ? &*structureValidator_ : handler);
   }
 
   // A factory of the read's own hears of its troubles; one the client set
@@ -74,20 +98,26 @@ class ReadChain {
 
   void index(MXFIndexHandler* handler) {
     if (!handler) return;
-    indexParser_.emplace(handler);
+    indexParser_.emplace(indexValidator_ ? &*indexValidator_ : handler);
     indexParser_->setErrorHandler(errors_);
     reader_.setIndexHandler(&*indexParser_);
   }
 
-  // Essence is never validated.
+  // The system validator counts edit units, whether the client wants them
+  // or not. Essence is never validated.
   void genericContainer(const ZeltaKeyClassifier* classifier, MXFGCStructureHandler* structure,
                         MXFSDTICPSystemHandler* sdticp, MXFQMProxySystemHandler* proxy, MXFGCEssenceHandler* essence) {
     if (!structure && !sdticp && !proxy && !essence) return;
     splitter_.emplace(classifier);
-    if (structure) splitter_->setStructureHandler(structure);
+    if (systemValidator_) {
+      systemValidator_->setStructureHandler(structure);
+      splitter_->setStructureHandler(&*systemValidator_);
+    } else if (structure) {
+      splitter_->setStructureHandler(structure);
+    }
     if (sdticp || proxy) {
       systemParser_.emplace();
-      systemParser_->setSDTICPHandler(sdticp);
+      systemParser_->setSDTICPHandler(systemValidator_ ? &*systemValidator_ : sdticp);
       systemParser_->setProxyHandler(proxy);
       systemParser_->setErrorHandler(errors_);
       splitter_->setSystemHandler(&*systemParser_);
@@ -102,6 +132,10 @@ class ReadChain {
   // The factory holds its handler weakly.
   const std::shared_ptr<ErrorHandler>& errorHandler_;
   ErrorHandler* errors_;
+  std::optional<ZeltaCrossValidator> cross_;
+  std::optional<ZeltaStructureValidator> structureValidator_;
+  std::optional<ZeltaIndexValidator> indexValidator_;
+  std::optional<ZeltaSystemValidator> systemValidator_;
   std::optional<ZeltaMetadataParser> metadataParser_;
   std::optional<MXFIndexParser> indexParser_;
   std::optional<ZeltaSystemParser> systemParser_;
@@ -112,6 +146,7 @@ void ZeltaReaderImpl::read() {
   MXFReader reader;
   reader.setSkipRunIn(true);
   ReadChain chain(reader, errorHandler_);
+  chain.validate(structureHandler_.get(), metadataHandler_.get(), indexHandler_.get(), sdticpHandler_.get());
   chain.structure(structureHandler_.get());
   chain.metadata(metadataHandler_.get(), factory_);
   chain.index(indexHandler_.get());
