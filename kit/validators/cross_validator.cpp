@@ -100,19 +100,17 @@ void ZeltaCrossValidator::setOperationalPattern(const KLVKey& label) {
 }
 
 void ZeltaCrossValidator::setBodySID(std::uint32_t bodySID) {
-  if (bodySID_ == 0 && bodySID != 0) {
+  if (bodySID_ == 0 && bodySID != 0)
     bodySID_ = bodySID;
-    return;
-  }
-  if (bodySID != bodySID_) reports_.error(kitBodySIDId, "unexpected bodySID value");
+  else if (bodySID == 0 || bodySID != bodySID_)
+    reports_.error(kitBodySIDId, "unexpected bodySID value");
 }
 
 void ZeltaCrossValidator::setIndexSID(std::uint32_t indexSID) {
-  if (indexSID_ == 0 && indexSID != 0) {
+  if (indexSID_ == 0 && indexSID != 0)
     indexSID_ = indexSID;
-    return;
-  }
-  if (indexSID != indexSID_) reports_.error(kitIndexSIDId, "unexpected indexSID value");
+  else if (indexSID == 0 || indexSID != indexSID_)
+    reports_.error(kitIndexSIDId, "unexpected indexSID value");
 }
 
 bool ZeltaCrossValidator::isSuitableEditRate(const MXFRational& rate) const {

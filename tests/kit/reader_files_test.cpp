@@ -105,17 +105,18 @@ const std::map<std::string, std::vector<std::string>> expectedFindings{
     // bmx's OP1a files: KAGSize = 00000001 in every partition pack; the
     // essence containers list the wave sound container (0D 01 03 01 02 06 01
     // 00), which the kit's formats do not use. The DV files put their
-    // essence in body partitions, which DV may not have; the single pass file
-    // leaves its header open.
+    // essence in body partitions, which DV may not have, so that their
+    // header partition says BodySID = 00000000 (and the single pass file's
+    // IndexSID = 00000000 too); the single pass file leaves its header open.
     {"bmx_op1a_dv25_625_bodypart_part4.mxf",
-     {"error 02 unexpected essenceContainers value", "error 07 unsupported KAG value", "error 07 unsupported KAG value",
-      "error 03 unexpected body partition", "error 07 unsupported KAG value", "error 03 unexpected body partition",
-      "error 07 unsupported KAG value"}},
+     {"error 02 unexpected essenceContainers value", "error 07 unsupported KAG value",
+      "error 09 unexpected bodySID value", "error 07 unsupported KAG value", "error 03 unexpected body partition",
+      "error 07 unsupported KAG value", "error 03 unexpected body partition", "error 07 unsupported KAG value"}},
     {"bmx_op1a_dv25_625_singlepass.mxf",
      {"error 02 unexpected essenceContainers value", "error 07 unsupported KAG value",
-      "warning 04 open or incomplete partition status", "error 07 unsupported KAG value",
-      "error 03 unexpected body partition", "error 07 unsupported KAG value", "error 03 unexpected body partition",
-      "error 07 unsupported KAG value"}},
+      "warning 04 open or incomplete partition status", "error 09 unexpected bodySID value",
+      "error 0A unexpected indexSID value", "error 07 unsupported KAG value", "error 03 unexpected body partition",
+      "error 07 unsupported KAG value", "error 03 unexpected body partition", "error 07 unsupported KAG value"}},
     // An H.264 file's body partitions are not asked for stream identifiers.
     {"bmx_op1a_h264_high422_longgop_1080p25_2mono.mxf",
      {"error 02 unexpected essenceContainers value", "error 07 unsupported KAG value", "error 07 unsupported KAG value",
@@ -125,18 +126,21 @@ const std::map<std::string, std::vector<std::string>> expectedFindings{
      {"error 02 unexpected essenceContainers value", "error 07 unsupported KAG value", "error 07 unsupported KAG value",
       "error 07 unsupported KAG value", "error 09 unexpected bodySID value", "error 07 unsupported KAG value"}},
     // OP-Atom is no pattern of the kit's, in each of the three partitions;
-    // the essence stands in a body partition; the footer of a closed header
-    // names index SID 2.
+    // the essence stands in a body partition, the header partition naming
+    // neither stream; the footer of a closed header names index SID 2.
     {"ffmpeg_opatom_dv25_625_v1.mxf",
-     {"error 02 unsupported operationalPattern value", "error 02 unsupported operationalPattern value",
+     {"error 02 unsupported operationalPattern value", "error 09 unexpected bodySID value",
+      "error 0A unexpected indexSID value", "error 02 unsupported operationalPattern value",
       "error 03 unexpected body partition", "error 02 unsupported operationalPattern value",
       "warning 0A non-zero indexSID value"}},
     // GStreamer: KAGSize = 00000001; the essence containers list the DV or
     // AVC picture and the wave sound container without the multiple essence
-    // label; DV in a body partition, and its footer names index SID 2.
+    // label; DV in a body partition, the header naming neither stream, and
+    // its footer names index SID 2.
     {"gst_dv25_625_420_2mono.mxf",
      {"warning 02 unexpected essenceContainers value (missing MULTIPLE_ESSENCE)",
-      "error 02 unexpected essenceContainers value", "error 07 unsupported KAG value", "error 07 unsupported KAG value",
+      "error 02 unexpected essenceContainers value", "error 07 unsupported KAG value",
+      "error 09 unexpected bodySID value", "error 0A unexpected indexSID value", "error 07 unsupported KAG value",
       "error 03 unexpected body partition", "error 07 unsupported KAG value", "warning 0A non-zero indexSID value"}},
     {"gst_h264_high_longgop_1080p25_2mono.mxf",
      {"warning 02 unexpected essenceContainers value (missing MULTIPLE_ESSENCE)",
