@@ -1,7 +1,8 @@
 // Feeds any input to MXFReader with an error handler and, by the input's
 // size, either counting KLV handlers on all four ports or the parsers behind
 // them: the metadata model of the kit's classes with the master collapsed
-// from it, the index table segments and the generic container splitter.
+// from it, the index table segments and the generic container splitter; or
+// to the kit's reader with every handler and an error handler.
 // Nothing may crash, leak, hang or touch memory it does not own, whatever
 // the input says.
 
@@ -89,8 +90,9 @@ private:
   std::size_t sum_ = 0;
 };
 
-class Model : public MXFMetadataModelHandler {
+class Model : public ZeltaMetadataHandler {
 public:
+  void packageItem(const std::uint8_t*, std::size_t size) override { count_ += size; }
   void start() override {}
   void end() override {}
   // A model that lacks what a master needs fails a check; anything else
@@ -186,14 +188,80 @@ void readThroughParsers(const std::uint8_t* data, std::size_t size) {
   read(data, size, reports, metadata, index, essence);
 }
 
+class SDTICP : public DullMXFSDTICPSystemHandler {
+public:
+  void systemMetadata(const MXFSDTICPSystemMetadata& pack) override { count_ += pack.continuityCount; }
+
+private:
+  std::size_t count_ = 0;
+};
+
+class Proxy : public MXFQMProxySystemHandler {
+public:
+  void proxySystem(std::uint32_t frameCount, const std::vector<MXFQMProxyTimecode>&) override { count_ += frameCount; }
+
+private:
+  std::size_t count_ = 0;
+};
+
+// A pipe that the reader may share.
+class PipeStream : public std::istream {
+public:
+  PipeStream(const std::uint8_t* data, std::size_t size) : std::istream(nullptr), buffer_(data, size) {
+    rdbuf(&buffer_);
+  }
+
+private:
+  PipeBuffer buffer_;
+};
+
+template <typename T>
+std::shared_ptr<T> borrowed(T& handler) {
+  return std::shared_ptr<T>(&handler, [](T*) {});
+}
+
+// The kit's reader with every handler and an error handler, so that every
+// parser and validator of the kit runs.
+void readThroughKit(const std::uint8_t* data, std::size_t size) {
+  Reports reports;
+  Structure structure;
+  Model model;
+  Segments segments;
+  DullMXFGCStructureHandler editUnits;
+  SDTICP sdticp;
+  Proxy proxy;
+  Essence essence;
+  std::shared_ptr<std::istream> input;
+  if (size % 2 == 0)
+    input = std::make_shared<util::vector_istream>(data, size);
+  else
+    input = std::make_shared<PipeStream>(data, size);
+  std::shared_ptr<ZeltaReader> reader = createZeltaReader(input);
+  reader->setStructureHandler(borrowed<MXFStructureHandler>(structure));
+  reader->setMetadataHandler(borrowed<ZeltaMetadataHandler>(model));
+  reader->setIndexHandler(borrowed<MXFIndexHandler>(segments));
+  reader->setGCStructureHandler(borrowed<MXFGCStructureHandler>(editUnits));
+  reader->setSDTICPHandler(borrowed<MXFSDTICPSystemHandler>(sdticp));
+  reader->setProxyHandler(borrowed<MXFQMProxySystemHandler>(proxy));
+  reader->setEssenceHandler(borrowed<MXFGCEssenceHandler>(essence));
+  reader->setErrorHandler(borrowed<ErrorHandler>(reports));
+  try {
+    reader->read();
+  } catch (const std::exception&) {
+    // Damaged input ends a read with an exception; that is its right end.
+  }
+}
+
 }  // namespace
 
-// Sizes 0 and 1 modulo 4 go to KLV handlers, 2 and 3 to the parsers; even
-// sizes are seekable, odd ones a pipe.
+// Sizes 0 and 1 modulo 6 go to KLV handlers, 2 and 3 to the parsers, 4 and
+// 5 to the kit's reader; even sizes are seekable, odd ones a pipe.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  if (size % 4 < 2)
+  if (size % 6 < 2)
     readAsKLV(data, size);
-  else
+  else if (size % 6 < 4)
     readThroughParsers(data, size);
+  else
+    readThroughKit(data, size);
   return 0;
 }
