@@ -7,13 +7,15 @@
 #include <string>
 
 #include "summary.h"
+#include "validate.h"
 
 namespace {
 
 using namespace zelta_info;
 
 const char* const usage =
-    "usage: zelta-info [--json] [--sets] [--index] [--essence [--md5]] [--system] [--model] [--master] FILE\n"
+    "usage: zelta-info [--json] [--sets] [--index] [--essence [--md5]] [--system] [--model] [--master]\n"
+    "                  [--validate] FILE\n"
     "       zelta-info --copy OUT FILE\n"
     "\n"
     "Reads the MXF file FILE (a run-in is skipped) and prints each partition\n"
@@ -50,6 +52,13 @@ const char* const usage =
     "           objects, weak ones as identifiers, and dark properties by key;\n"
     "           objects that nothing owns follow the root; the model parser's\n"
     "           reports join the others\n"
+    "  --master also print the forty-one values of the clip's master metadata\n"
+    "           collapsed from that model, or the condition that the model\n"
+    "           breaks\n"
+    "  --validate\n"
+    "           also read the file through the kit's reader with its\n"
+    "           validators, whose findings (identifiers 4c50xxxx) join the\n"
+    "           other reports\n"
     "  --copy OUT\n"
     "           copy FILE to OUT element by element, through the KLV reader\n"
     "           and writer\n"
@@ -80,7 +89,7 @@ void collectModel(Summary& summary, const Details& details, ErrorHandler& report
 }
 
 // Reads the whole file; false when a fatal error stopped the read.
-bool readFile(std::istream& in, Summary& summary, const Details& details) {
+bool readFile(std::istream& in, const std::string& path, Summary& summary, const Details& details) {
   Reporter reporter(summary);
   SetCollector setCollector(summary);
   MXFMetadataParser setParser(&setCollector);
@@ -109,6 +118,7 @@ bool readFile(std::istream& in, Summary& summary, const Details& details) {
     reader.read(in);
     essenceCollector.finish();
     collectModel(summary, details, reporter);
+    if (details.validate) validateFile(path, reporter);
     return true;
   } catch (const std::exception& e) {
     essenceCollector.finish();
@@ -118,6 +128,7 @@ bool readFile(std::istream& in, Summary& summary, const Details& details) {
         summary.reports.back().message != e.what())
       reporter.fatalError(MXFUID(), e.what());
     collectModel(summary, details, reporter);
+    if (details.validate) validateFile(path, reporter);
     return false;
   }
 }
@@ -168,6 +179,8 @@ bool parseOptions(int argc, char** argv, Options& options) {
       options.details.model = true;
     } else if (std::strcmp(argv[i], "--master") == 0) {
       options.details.master = true;
+    } else if (std::strcmp(argv[i], "--validate") == 0) {
+      options.details.validate = true;
     } else if (std::strcmp(argv[i], "--copy") == 0 && i + 1 < argc) {
       options.copyTo = argv[++i];
     } else if (argv[i][0] == '-' || !options.file.empty()) {
@@ -199,7 +212,7 @@ int main(int argc, char** argv) {
   }
   if (!options.copyTo.empty()) return copyFile(in, options.copyTo) ? 0 : 1;
   Summary summary;
-  bool ok = readFile(in, summary, options.details);
+  bool ok = readFile(in, options.file, summary, options.details);
   if (summary.suppressed != 0) std::cerr << "suppressed: " << summary.suppressed << " further reports\n";
   if (options.json)
     printJson(std::cout, options.file, !ok, summary, options.details);

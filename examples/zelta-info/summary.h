@@ -170,6 +170,7 @@ struct Details {
   bool system = false;
   bool model = false;
   bool master = false;
+  bool validate = false;
 };
 
 // Text forms shared by the printers.
