@@ -2,6 +2,7 @@
 // an MXF file, as the library's readers see them.
 
 #include <cstring>
+#include <filesystem>
 #include <fstream>
 #include <iostream>
 #include <string>
@@ -88,6 +89,22 @@ void collectModel(Summary& summary, const Details& details, ErrorHandler& report
   if (details.master) summary.master = extractMaster(summary.model);
 }
 
+// A value that runs past the end of a file that can seek ends the read as
+// the end of the file would: the octets that the last partition's elements
+// claim beyond the file's end tell that it was cut.
+void reportMissingOctets(const Summary& summary, const std::string& path, ErrorHandler& reports) {
+  if (summary.partitions.empty()) return;
+  std::error_code failure;
+  const std::uintmax_t size = std::filesystem::file_size(path, failure);
+  if (failure) return;
+  const Partition& last = summary.partitions.back();
+  std::uint64_t end = last.offset + last.packLength;
+  for (const Section& section : last.sections) end += section.bytes;
+  if (end > size)
+    reports.warning(MXFUID(), "last element runs past the end of the file - " + std::to_string(end - size) +
+                                  " octets missing");
+}
+
 // Reads the whole file; false when a fatal error stopped the read.
 bool readFile(std::istream& in, const std::string& path, Summary& summary, const Details& details) {
   Reporter reporter(summary);
@@ -117,6 +134,7 @@ bool readFile(std::istream& in, const std::string& path, Summary& summary, const
   try {
     reader.read(in);
     essenceCollector.finish();
+    reportMissingOctets(summary, path, reporter);
     collectModel(summary, details, reporter);
     if (details.validate) validateFile(path, reporter);
     return true;
@@ -127,6 +145,7 @@ bool readFile(std::istream& in, const std::string& path, Summary& summary, const
     if (summary.reports.empty() || summary.reports.back().severity != "fatal" ||
         summary.reports.back().message != e.what())
       reporter.fatalError(MXFUID(), e.what());
+    reportMissingOctets(summary, path, reporter);
     collectModel(summary, details, reporter);
     if (details.validate) validateFile(path, reporter);
     return false;
