@@ -11,6 +11,10 @@
 //   against a plain read() loop of 1 MiB over the same file;
 // - the skip walk: MXFReader with the header metadata and index parsers, the
 //   essence skipped; measured against a pread() walk of keys and lengths.
+//
+// And the kit's reader on the D-10 file: with the essence handler alone,
+// and with every handler and an error handler, so that every parser and
+// validator of the kit runs.
 #include <benchmark/benchmark.h>
 
 #include <fcntl.h>
@@ -25,6 +29,7 @@
 #include <vector>
 
 #include "bench_files.h"
+#include "kit.h"
 #include "klv.h"
 #include "mxf.h"
 
@@ -253,6 +258,64 @@ void BM_SkipWalk(benchmark::State& state) {
   zelta_bench::reportThroughput(state, octets, octets / file->octets * file->essenceElements);
 }
 
+class ModelSink : public ZeltaMetadataHandler {
+public:
+  void start() override {}
+  void end() override {}
+  void model(const MXFMetadataModel& objects) override { benchmark::DoNotOptimize(&objects); }
+  void packageItem(const std::uint8_t* data, std::size_t) override { benchmark::DoNotOptimize(data); }
+};
+
+class ReportSink : public ErrorHandler {
+public:
+  void setLocator(Locator*) override {}
+  void start() override {}
+  void end() override {}
+  void warning(const MXFUID&, const std::string& message) override { benchmark::DoNotOptimize(&message); }
+  void error(const MXFUID&, const std::string& message) override { benchmark::DoNotOptimize(&message); }
+  void fatalError(const MXFUID&, const std::string& message) override { benchmark::DoNotOptimize(&message); }
+};
+
+template <typename T>
+std::shared_ptr<T> borrowed(T& object) {
+  return std::shared_ptr<T>(&object, [](T*) {});
+}
+
+// Arguments: the file, the client's stream buffer size, and 1 for every
+// handler with an error handler, 0 for the essence handler alone.
+void BM_KitRead(benchmark::State& state) {
+  const BenchFile* file = caseFile(state);
+  if (!file) return;
+  std::vector<char> streamBuffer(static_cast<std::size_t>(state.range(1)));
+  TakingHandler essence(file->handlerBuffers);
+  DullMXFStructureHandler structure;
+  ModelSink metadata;
+  IndexSink index;
+  DullMXFGCStructureHandler editUnits;
+  DullMXFSDTICPSystemHandler system;
+  ReportSink reports;
+  std::uint64_t octets = 0;
+  for (auto _ : state) {
+    auto in = std::make_shared<std::ifstream>();
+    zelta_bench::openWithStreamBuffer(*in, file->path, streamBuffer);
+    std::shared_ptr<ZeltaReader> reader = createZeltaReader(in);
+    reader->setEssenceHandler(borrowed<MXFGCEssenceHandler>(essence));
+    if (state.range(2) != 0) {
+      reader->setStructureHandler(borrowed<MXFStructureHandler>(structure));
+      reader->setMetadataHandler(borrowed<ZeltaMetadataHandler>(metadata));
+      reader->setIndexHandler(borrowed<MXFIndexHandler>(index));
+      reader->setGCStructureHandler(borrowed<MXFGCStructureHandler>(editUnits));
+      reader->setSDTICPHandler(borrowed<MXFSDTICPSystemHandler>(system));
+      reader->setErrorHandler(borrowed<ErrorHandler>(reports));
+    }
+    essence.elements = 0;
+    reader->read();
+    check(essence.elements == file->essenceElements, "every essence element read");
+    octets += file->octets;
+  }
+  zelta_bench::reportThroughput(state, octets, octets / file->octets * file->essenceElements);
+}
+
 // Arguments: the file, and the size of the reads and of the one buffer that
 // they fill.
 void BM_PlainReadLoop(benchmark::State& state) {
@@ -274,6 +337,13 @@ void readerCases(benchmark::internal::Benchmark* benchmark) {
   benchmark->ArgNames({"file", "streamBuffer"});
   for (const std::int64_t file : files)
     for (const std::int64_t buffer : streamBuffers) benchmark->Args({file, buffer});
+  benchmark->Unit(benchmark::kMillisecond)->UseRealTime();
+}
+
+void kitCases(benchmark::internal::Benchmark* benchmark) {
+  benchmark->ArgNames({"file", "streamBuffer", "everyHandler"});
+  for (const std::int64_t buffer : {std::int64_t(0), std::int64_t(1048576)})
+    for (const std::int64_t every : {0, 1}) benchmark->Args({d10File, buffer, every});
   benchmark->Unit(benchmark::kMillisecond)->UseRealTime();
 }
 
@@ -299,5 +369,6 @@ BENCHMARK(BM_PlainReadLoop)->Apply(plainCases);
 BENCHMARK(BM_EssenceRead)->Apply(readerCases);
 BENCHMARK(BM_PreadWalk)->Apply(walkCases);
 BENCHMARK(BM_SkipWalk)->Apply(readerCases);
+BENCHMARK(BM_KitRead)->Apply(kitCases);
 
 BENCHMARK_MAIN();
