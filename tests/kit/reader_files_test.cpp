@@ -78,17 +78,6 @@ TEST(ReaderFiles, EveryWellFormedFileGivesTheEventsOfTheLowerLayers) {
   }
 }
 
-// "severity NN text", NN the last octet of the identifier's first four.
-std::vector<std::string> kitFindings(const std::vector<Report>& reports) {
-  std::vector<std::string> lines;
-  for (const Report& report : kitReports(reports)) {
-    char code[3];
-    std::snprintf(code, sizeof code, "%02X", report.identifier[3]);
-    lines.push_back(report.severity + " " + code + " " + report.message);
-  }
-  return lines;
-}
-
 // What the kit's validators find in each file of another writer, in order,
 // with the reason from the independent dumps (mxfdump of the original).
 // Partition by partition: the header, the body partitions, the footer.

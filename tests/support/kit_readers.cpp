@@ -1,5 +1,6 @@
 #include "support/kit_readers.h"
 
+#include <cstdio>
 #include <exception>
 #include <fstream>
 #include <memory>
@@ -126,6 +127,16 @@ std::vector<Report> kitReports(const std::vector<Report>& reports) {
   for (const Report& report : reports)
     if (isKitReport(report)) kept.push_back(report);
   return kept;
+}
+
+std::vector<std::string> kitFindings(const std::vector<Report>& reports) {
+  std::vector<std::string> lines;
+  for (const Report& report : kitReports(reports)) {
+    char code[3];
+    std::snprintf(code, sizeof code, "%02X", report.identifier[3]);
+    lines.push_back(report.severity + " " + code + " " + report.message);
+  }
+  return lines;
 }
 
 }  // namespace zelta_test

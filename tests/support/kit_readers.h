@@ -64,6 +64,8 @@ std::vector<std::string> reportLines(const std::vector<Report>& reports);
 std::vector<Report> withoutKitReports(const std::vector<Report>& reports);
 // Only those.
 std::vector<Report> kitReports(const std::vector<Report>& reports);
+// Those as "severity NN text", NN the fourth octet of the identifier.
+std::vector<std::string> kitFindings(const std::vector<Report>& reports);
 
 }  // namespace zelta_test
 

@@ -9,37 +9,32 @@
 
 #include "core/failure.h"
 #include "kit.h"
+#include "kit/validators/container_labels.h"
+#include "support/kit_readers.h"
 #include "support/recording.h"
 
 using namespace zelta_test;
 
 namespace {
 
-const KLVKey d10 = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 01 01 01");
-const KLVKey mpeg = keyOf("06 0E 2B 34 04 01 01 02 0D 01 03 01 02 04 60 01");
-const KLVKey proxy = keyOf("06 0E 2B 34 04 01 01 02 0D 01 03 01 02 04 61 07");
-const KLVKey aes3 = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 06 03 00");
-const KLVKey wave = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 06 01 00");
-const KLVKey proxySound = keyOf("06 0E 2B 34 04 01 01 03 0D 01 03 01 02 0A 03 00");
-const KLVKey anc = keyOf("06 0E 2B 34 04 01 01 09 0D 01 03 01 02 0E 00 00");
-const KLVKey multiple = keyOf("06 0E 2B 34 04 01 01 03 0D 01 03 01 02 7F 01 00");
-const KLVKey op1a = keyOf("06 0E 2B 34 04 01 01 01 0D 01 02 01 01 01 09 00");
-const KLVKey proxyPattern = keyOf("06 0E 2B 34 04 01 01 01 0E 06 02 01 40 01 09 00");
-const KLVKey opAtom = keyOf("06 0E 2B 34 04 01 01 02 0D 01 02 01 10 03 00 00");
+const KLVKey& d10 = d10Label;
+const KLVKey& mpeg = mpegLabel;
+const KLVKey& proxy = proxyLabel;
+const KLVKey& aes3 = aes3Label;
+const KLVKey& wave = waveLabel;
+const KLVKey& proxySound = proxySoundLabel;
+const KLVKey& anc = ancLabel;
+const KLVKey& multiple = multipleLabel;
+const KLVKey& op1a = op1aLabel;
+const KLVKey& proxyPattern = proxyPatternLabel;
+const KLVKey& opAtom = opAtomLabel;
 
 struct Fixture {
   Fixture() { cross.setErrorHandler(&errors); }
-  // "severity NN text"
+  // Every report, each a finding of the kit's.
   std::vector<std::string> findings() const {
-    std::vector<std::string> lines;
-    for (const Report& r : errors.reports) {
-      EXPECT_EQ(r.identifier[0], 0x4C);
-      EXPECT_EQ(r.identifier[1], 0x50);
-      char code[3];
-      std::snprintf(code, sizeof code, "%02X", r.identifier[3]);
-      lines.push_back(r.severity + " " + code + " " + r.message);
-    }
-    return lines;
+    EXPECT_EQ(kitReports(errors.reports).size(), errors.reports.size());
+    return kitFindings(errors.reports);
   }
   RecordingErrorHandler errors;
   ZeltaCrossValidator cross;

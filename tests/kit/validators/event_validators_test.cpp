@@ -9,10 +9,12 @@
 
 #include "core/failure.h"
 #include "kit.h"
+#include "kit/validators/container_labels.h"
 #include "kit/validators/index_validator.h"
 #include "kit/validators/structure_validator.h"
 #include "kit/validators/system_validator.h"
 #include "support/essence_recording.h"
+#include "support/kit_readers.h"
 #include "support/mxf_index_segments.h"
 #include "support/mxf_streams.h"
 #include "support/recording.h"
@@ -23,11 +25,11 @@ namespace {
 
 typedef std::vector<std::string> Lines;
 
-const KLVKey d10 = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 01 01 01");
-const KLVKey mpeg = keyOf("06 0E 2B 34 04 01 01 02 0D 01 03 01 02 04 60 01");
-const KLVKey proxy = keyOf("06 0E 2B 34 04 01 01 02 0D 01 03 01 02 04 61 07");
-const KLVKey op1a = keyOf("06 0E 2B 34 04 01 01 01 0D 01 02 01 01 01 09 00");
-const KLVKey proxyPattern = keyOf("06 0E 2B 34 04 01 01 01 0E 06 02 01 40 01 09 00");
+const KLVKey& d10 = d10Label;
+const KLVKey& mpeg = mpegLabel;
+const KLVKey& proxy = proxyLabel;
+const KLVKey& op1a = op1aLabel;
+const KLVKey& proxyPattern = proxyPatternLabel;
 
 // Kind 2 header, 3 body, 4 footer; status 4 closed complete.
 const KLVKey closedHeader = partitionKey(2, 4);
@@ -36,13 +38,8 @@ const KLVKey body = partitionKey(3, 4);
 const KLVKey footer = partitionKey(4, 4);
 
 std::vector<std::string> findings(const RecordingErrorHandler& errors) {
-  std::vector<std::string> lines;
-  for (const Report& r : errors.reports) {
-    char code[3];
-    std::snprintf(code, sizeof code, "%02X", r.identifier[3]);
-    lines.push_back(r.severity + " " + code + " " + r.message);
-  }
-  return lines;
+  EXPECT_EQ(kitReports(errors.reports).size(), errors.reports.size());
+  return kitFindings(errors.reports);
 }
 
 MXFPartitionPack packOf(const KLVKey& picture, std::uint64_t offset, std::uint32_t bodySID = 1,

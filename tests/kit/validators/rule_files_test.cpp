@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "kit.h"
+#include "kit/validators/container_labels.h"
 #include "support/kit_readers.h"
 #include "support/mxf_index_segments.h"
 #include "support/mxf_primed_sets.h"
@@ -26,14 +27,6 @@ using namespace zelta_test;
 namespace {
 
 typedef std::vector<std::string> Lines;
-
-const KLVKey mpeg = keyOf("06 0E 2B 34 04 01 01 02 0D 01 03 01 02 04 60 01");
-const KLVKey d10 = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 01 01 01");
-const KLVKey aes3 = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 06 03 00");
-const KLVKey wave = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 06 01 00");
-const KLVKey unknownPicture = keyOf("06 0E 2B 34 04 01 01 01 0D 01 03 01 02 7E 01 00");
-const KLVKey opAtom = keyOf("06 0E 2B 34 04 01 01 02 0D 01 02 01 10 03 00 00");
-const KLVKey op1a = keyOf("06 0E 2B 34 04 01 01 01 0D 01 02 01 01 01 09 00");
 
 constexpr std::uint32_t kag = 512;
 
@@ -65,7 +58,7 @@ MXFPartitionPack packOf(std::uint32_t bodySID, std::uint32_t indexSID, const std
   pack.kagSize = kag;
   pack.bodySID = bodySID;
   pack.indexSID = indexSID;
-  pack.operationalPattern = op1a;
+  pack.operationalPattern = op1aLabel;
   pack.essenceContainers = containers;
   return pack;
 }
@@ -94,9 +87,9 @@ ByteVector segment(std::uint32_t bodySID, std::uint32_t indexSID, const std::str
 // of stream 2, and a random index.
 FileSpec goodFile() {
   FileSpec file;
-  file.partitions.push_back({2, 4, packOf(0, 0, {mpeg}), {}, {}});
-  file.partitions.push_back({3, 4, packOf(1, 0, {mpeg}), {}, concat({systemItem(0x5C), systemItem(0x5C)})});
-  file.partitions.push_back({4, 4, packOf(0, 2, {mpeg}), segment(1, 2, "00 00 00 19 00 00 00 01"), {}});
+  file.partitions.push_back({2, 4, packOf(0, 0, {mpegLabel}), {}, {}});
+  file.partitions.push_back({3, 4, packOf(1, 0, {mpegLabel}), {}, concat({systemItem(0x5C), systemItem(0x5C)})});
+  file.partitions.push_back({4, 4, packOf(0, 2, {mpegLabel}), segment(1, 2, "00 00 00 19 00 00 00 01"), {}});
   return file;
 }
 
@@ -138,13 +131,7 @@ Lines findingsOf(const FileSpec& spec) {
   reader->setErrorHandler(std::shared_ptr<ErrorHandler>(&record.errors, [](ErrorHandler*) {}));
   reader->read();
   EXPECT_FALSE(record.index.segments.empty());
-  Lines lines;
-  for (const Report& r : kitReports(record.errors.reports)) {
-    char code[3];
-    std::snprintf(code, sizeof code, "%02X", r.identifier[3]);
-    lines.push_back(r.severity + " " + code + " " + r.message);
-  }
-  return lines;
+  return kitFindings(record.errors.reports);
 }
 
 FileSpec changed(const std::function<void(FileSpec&)>& change) {
@@ -164,33 +151,33 @@ TEST(RuleFiles, UnsupportedEssenceContainers) {
   EXPECT_EQ(findingsOf(changed([](FileSpec& f) { setContainers(f, {}); })),
             Lines{"error 02 unsupported essenceContainers value"});
   // An unknown label is also one left over.
-  EXPECT_EQ(findingsOf(changed([](FileSpec& f) { setContainers(f, {unknownPicture}); })),
+  EXPECT_EQ(findingsOf(changed([](FileSpec& f) { setContainers(f, {unknownPictureLabel}); })),
             (Lines{"error 02 unsupported essenceContainers value", "error 02 unexpected essenceContainers value"}));
 }
 
 TEST(RuleFiles, UnexpectedEssenceContainers) {
   EXPECT_EQ(findingsOf(changed([](FileSpec& f) {
-              f.partitions[2].pack.essenceContainers = {mpeg, aes3};
+              f.partitions[2].pack.essenceContainers = {mpegLabel, aes3Label};
             })),
             Lines{"error 02 unexpected essenceContainers value"});
 }
 
 TEST(RuleFiles, MissingMultipleEssenceLabel) {
   EXPECT_EQ(findingsOf(changed([](FileSpec& f) {
-              setContainers(f, {mpeg, aes3});
+              setContainers(f, {mpegLabel, aes3Label});
             })),
             Lines{"warning 02 unexpected essenceContainers value (missing MULTIPLE_ESSENCE)"});
 }
 
 TEST(RuleFiles, UnsupportedOperationalPattern) {
-  EXPECT_EQ(findingsOf(changed([](FileSpec& f) { f.partitions[0].pack.operationalPattern = opAtom; })),
+  EXPECT_EQ(findingsOf(changed([](FileSpec& f) { f.partitions[0].pack.operationalPattern = opAtomLabel; })),
             Lines{"error 02 unsupported operationalPattern value"});
 }
 
 TEST(RuleFiles, UnexpectedBodyPartition) {
   // D-10 keeps its essence in the header partition, which names its streams.
   EXPECT_EQ(findingsOf(changed([](FileSpec& f) {
-              setContainers(f, {d10});
+              setContainers(f, {d10Label});
               f.partitions[0].pack.bodySID = 1;
               f.partitions[0].pack.indexSID = 2;
               f.partitions[2].pack.indexSID = 0;
@@ -267,7 +254,7 @@ TEST(RuleFiles, UnexpectedIndexSID) {
 
 TEST(RuleFiles, NonZeroIndexSIDInTheFooterOfAClosedD10Header) {
   EXPECT_EQ(findingsOf(changed([](FileSpec& f) {
-              setContainers(f, {d10});
+              setContainers(f, {d10Label});
               f.partitions[0].pack.bodySID = 1;
               f.partitions[0].pack.indexSID = 2;
               f.partitions[0].essence = f.partitions[1].essence;
