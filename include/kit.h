@@ -1,6 +1,6 @@
 // Zelta: the kit layer, one header of sub-headers: the master metadata and
-// the kit's identity, the metadata factory, the model builder and master extraction, and the
-// reader.
+// the kit's identity, the metadata factory, the model builder and master
+// extraction, the reader and the writer.
 #ifndef ZELTA_KIT_H
 #define ZELTA_KIT_H
 
@@ -10,5 +10,6 @@
 #include "kit_master.h"
 #include "kit_reader.h"
 #include "kit_validation.h"
+#include "kit_writer.h"
 
 #endif

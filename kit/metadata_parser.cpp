@@ -3,15 +3,7 @@
 #include <memory>
 
 #include "core/reservation.h"
-
-namespace {
-
-// 06 0E 2B 34 01 01 01 vv 03 01 02 20 01 00 00 00; KLVKey equality ignores
-// the version.
-constexpr KLVKey packageItemKey(std::array<std::uint8_t, 16>{0x06, 0x0E, 0x2B, 0x34, 0x01, 0x01, 0x01, 0x00, 0x03, 0x01,
-                                                             0x02, 0x20, 0x01, 0x00, 0x00, 0x00});
-
-}  // namespace
+#include "kit/package_item.h"
 
 ZeltaMetadataParser::ZeltaMetadataParser(ZeltaMetadataHandler* handler,
                                          const std::shared_ptr<MXFMetadataModelFactory>& factory)
@@ -20,7 +12,7 @@ ZeltaMetadataParser::ZeltaMetadataParser(ZeltaMetadataHandler* handler,
 // The capture keeps the buffer from item to item; a length from the file
 // only hints at its size.
 bool ZeltaMetadataParser::startIndividualItem(const KLVKey& key, std::uint64_t length, std::uint8_t*& buffer) {
-  if (!(key == packageItemKey)) return KLVForwarder::startIndividualItem(key, length, buffer);
+  if (!(key == zelta::packageItemKey)) return KLVForwarder::startIndividualItem(key, length, buffer);
   item_.clear();
   item_.reserve(zelta::reservationFor(length));
   capturing_ = true;
