@@ -38,7 +38,6 @@ void ZeltaStructureValidator::setRunIn(std::uint32_t runIn) { handler_->setRunIn
 void ZeltaStructureValidator::startStream() {
   inPartition_ = false;
   headerSeen_ = false;
-  bodySeen_ = false;
   footerSeen_ = false;
   randomIndexSeen_ = false;
   headerKey_.reset();
@@ -103,7 +102,6 @@ void ZeltaStructureValidator::header(std::optional<ZeltaEssenceFormat> format, c
 // D-10 and DV keep their essence in the header partition; the Proxy's and
 // Raw's own body partitions are allowed.
 void ZeltaStructureValidator::body(std::optional<ZeltaEssenceFormat> format, const MXFPartitionPack& pack) {
-  bodySeen_ = true;
   if (isOneOf(format, {ZeltaEssenceFormat::D10, ZeltaEssenceFormat::DV}))
     reports_.error(kitPartitionId, "unexpected body partition");
   if (isOneOf(format, {ZeltaEssenceFormat::MPEG, ZeltaEssenceFormat::Proxy, ZeltaEssenceFormat::Raw})) {

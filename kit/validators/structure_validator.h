@@ -34,7 +34,6 @@ class ZeltaStructureValidator : public MXFStructureHandler {
   zelta::Reports reports_;
   bool inPartition_ = false;
   bool headerSeen_ = false;
-  bool bodySeen_ = false;
   bool footerSeen_ = false;
   bool randomIndexSeen_ = false;
   std::optional<KLVKey> headerKey_;
