@@ -6,8 +6,6 @@
 
 namespace {
 
-constexpr std::size_t kindOctet = 13;
-constexpr std::uint8_t headerKind = 2;
 constexpr std::uint32_t newerVersion = 0x0103;
 // Older MPEG files of the kind write their fill items under the key of
 // registry version 2.
@@ -32,7 +30,7 @@ void FillItemKeyModeStructureFilter::startPartition(const KLVKey& key, const MXF
                                                     std::uint64_t packLength) {
   check(isMXFPartitionKey(key), "valid partition key");
   const std::uint32_t version = (std::uint32_t{pack.majorVersion} << 8) | pack.minorVersion;
-  if (key[kindOctet] == headerKind && getFillItemKeyVersion(stream_) == 0 && version < newerVersion &&
+  if (getMXFPartitionKind(key) == MXFHeaderPartition && getFillItemKeyVersion(stream_) == 0 && version < newerVersion &&
       holdsMPEG(pack.essenceContainers) && pack.headerByteCount != 0)
     setFillItemKeyVersion(stream_, olderMPEGFillKeyVersion);
   handler_->startPartition(key, pack, packLength);

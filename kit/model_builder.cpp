@@ -7,6 +7,7 @@
 #include "kit.h"
 #include "kit/essence_formats.h"
 #include "kit/model_labels.h"
+#include "kit/user_stamp.h"
 #include "metadata/present_time.h"
 
 namespace zelta {
@@ -15,10 +16,6 @@ namespace {
 
 // A date of the master, or the time of building when it has none.
 MXFTimestamp dateOr(const MXFTimestamp& date, const MXFTimestamp& now) { return date == MXFTimestamp() ? now : date; }
-
-std::uint16_t roundedTimecodeBase(const MXFRational& rate) {
-  return static_cast<std::uint16_t>((rate.numerator + rate.denominator / 2) / rate.denominator);
-}
 
 // D-10 carries all its channels in one track, and none when it has no
 // sound.
@@ -177,7 +174,7 @@ class ModelGraph {
     std::shared_ptr<TimecodeComponent> timecode = build_.make<TimecodeComponent>();
     timecode->setDataDefinition(timecodeDataDefinition);
     timecode->setDuration(duration);
-    timecode->setRoundedTimecodeBase(roundedTimecodeBase(build_.editRate));
+    timecode->setRoundedTimecodeBase(static_cast<std::uint16_t>(getRoundedRate(build_.editRate)));
     timecode->setStartTimecode(startTimecode);
     timecode->setDropFrame(master_.isDropFrame());
     return timelineTrack(1, 0, origin, sequenceOf(timecode));

@@ -18,24 +18,24 @@ std::uint8_t bcd(std::uint8_t value, std::uint8_t limit) {
   return static_cast<std::uint8_t>(((value / 10) << 4) | (value % 10));
 }
 
-std::uint32_t roundedRate(const MXFRational& rate) {
+}  // namespace
+
+std::uint32_t getRoundedRate(const MXFRational& rate) {
   return rate.denominator <= 0 || rate.numerator <= 0
              ? 0
              : static_cast<std::uint32_t>((static_cast<std::int64_t>(rate.numerator) + rate.denominator / 2) /
                                           rate.denominator);
 }
 
-}  // namespace
-
 std::uint32_t getTimecodeBase(const MXFRational& editRate) {
-  const std::uint32_t rounded = roundedRate(editRate);
+  const std::uint32_t rounded = getRoundedRate(editRate);
   return rounded > largestBase ? rounded / 2 : rounded;
 }
 
 std::unique_ptr<TimecodeCalculator> makeStampCalculator(const MXFRational& editRate, bool dropFrame) {
   const std::uint32_t base = getTimecodeBase(editRate);
   return std::unique_ptr<TimecodeCalculator>(createTimecodeCalculator(
-      static_cast<std::uint8_t>(base), dropFrame && base == dropFrameBase, roundedRate(editRate) > largestBase));
+      static_cast<std::uint8_t>(base), dropFrame && base == dropFrameBase, getRoundedRate(editRate) > largestBase));
 }
 
 MXFSDTICPTimeStamp getUserStamp(const TimecodeCalculator& calculator, std::uint32_t count, std::uint32_t timecodeBase,

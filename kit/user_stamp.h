@@ -17,6 +17,8 @@ inline constexpr std::uint8_t userStampKind = 0x81;
 // base of 30.
 std::unique_ptr<TimecodeCalculator> makeStampCalculator(const MXFRational& editRate, bool dropFrame);
 std::uint32_t getTimecodeBase(const MXFRational& editRate);
+// The rate rounded to whole frames a second; 0 for a rate of no frames.
+std::uint32_t getRoundedRate(const MXFRational& editRate);
 
 // The stamp of a count: the kind octet, then frames, seconds, minutes and
 // hours in BCD ("valid tens"), the drop frame flag in bit 6 of the frames,

@@ -7,13 +7,7 @@ namespace {
 constexpr std::uint32_t kagUnit = 512;
 // Header metadata that a reader of the kit's files can hold at once.
 constexpr std::uint64_t largestHeaderByteCount = 0x4FFE01;
-constexpr std::uint8_t closedCompleteStatus = 4;
-constexpr std::uint8_t closedIncompleteStatus = 2;
-constexpr std::size_t kindOctet = 13;
-constexpr std::size_t statusOctet = 14;
 constexpr std::size_t versionOctet = 7;
-constexpr std::uint8_t headerKind = 2;
-constexpr std::uint8_t bodyKind = 3;
 
 bool isOneOf(std::optional<ZeltaEssenceFormat> format, std::initializer_list<ZeltaEssenceFormat> formats) {
   if (!format) return false;
@@ -23,7 +17,8 @@ bool isOneOf(std::optional<ZeltaEssenceFormat> format, std::initializer_list<Zel
 }
 
 bool isClosed(const KLVKey& key) {
-  return key[statusOctet] == closedIncompleteStatus || key[statusOctet] == closedCompleteStatus;
+  const MXFPartitionStatus status = getMXFPartitionStatus(key);
+  return status == MXFClosedIncomplete || status == MXFClosedComplete;
 }
 
 }  // namespace
@@ -66,9 +61,9 @@ void ZeltaStructureValidator::startPartition(const KLVKey& key, const MXFPartiti
   checkAlignment(format, pack);
   cross_->setOperationalPattern(pack.operationalPattern);
   check(isMXFPartitionKey(key) && key[versionOctet] != 0, "valid partition key");
-  if (key[kindOctet] == headerKind)
+  if (getMXFPartitionKind(key) == MXFHeaderPartition)
     header(format, key, pack);
-  else if (key[kindOctet] == bodyKind)
+  else if (getMXFPartitionKind(key) == MXFBodyPartition)
     body(format, pack);
   else
     footer(format, pack);
@@ -89,7 +84,7 @@ void ZeltaStructureValidator::header(std::optional<ZeltaEssenceFormat> format, c
                                      const MXFPartitionPack& pack) {
   headerSeen_ = true;
   headerKey_ = key;
-  if (key[statusOctet] != closedCompleteStatus)
+  if (getMXFPartitionStatus(key) != MXFClosedComplete)
     reports_.warning(kitPartitionStatusId, "open or incomplete partition status");
   if (pack.headerByteCount >= largestHeaderByteCount)
     reports_.error(kitHeaderByteCountId, "unsupported headerByteCount value");

@@ -21,11 +21,6 @@ using namespace zelta_test;
 
 namespace {
 
-template <typename T>
-std::shared_ptr<T> borrowed(T* handler) {
-  return std::shared_ptr<T>(handler, [](T*) {});
-}
-
 // The partition offsets are the writer's to decide: a pack that names the
 // footer's place in the file that was read may not name it in the copy.
 class FooterOffsetCleared : public MXFStructureHandler {
@@ -50,12 +45,12 @@ class FooterOffsetCleared : public MXFStructureHandler {
 void pipe(std::shared_ptr<std::istream> input, ZeltaWriter& writer) {
   std::shared_ptr<ZeltaReader> reader = createZeltaReader(input);
   reader->setStructureHandler(std::make_shared<FooterOffsetCleared>(writer.getStructureHandler()));
-  reader->setMetadataHandler(borrowed(writer.getMetadataHandler()));
-  reader->setIndexHandler(borrowed(writer.getIndexHandler()));
-  reader->setGCStructureHandler(borrowed(writer.getGCStructureHandler()));
-  reader->setSDTICPHandler(borrowed(writer.getSDTICPHandler()));
-  reader->setProxyHandler(borrowed(writer.getProxyHandler()));
-  reader->setEssenceHandler(borrowed(writer.getEssenceHandler()));
+  reader->setMetadataHandler(borrowed(*writer.getMetadataHandler()));
+  reader->setIndexHandler(borrowed(*writer.getIndexHandler()));
+  reader->setGCStructureHandler(borrowed(*writer.getGCStructureHandler()));
+  reader->setSDTICPHandler(borrowed(*writer.getSDTICPHandler()));
+  reader->setProxyHandler(borrowed(*writer.getProxyHandler()));
+  reader->setEssenceHandler(borrowed(*writer.getEssenceHandler()));
   reader->read();
 }
 
@@ -78,12 +73,12 @@ std::string rewritten(const std::string& name) {
 ReadRecord readBack(const std::string& bytes) {
   ReadRecord record;
   std::shared_ptr<ZeltaReader> reader = createZeltaReader(memoryStream(bytes));
-  reader->setStructureHandler(borrowed<MXFStructureHandler>(&record.structure));
-  reader->setMetadataHandler(borrowed<ZeltaMetadataHandler>(&record.metadata));
-  reader->setIndexHandler(borrowed<MXFIndexHandler>(&record.index));
-  reader->setGCStructureHandler(borrowed<MXFGCStructureHandler>(&record.gc));
-  reader->setSDTICPHandler(borrowed<MXFSDTICPSystemHandler>(&record.sdticp));
-  reader->setEssenceHandler(borrowed<MXFGCEssenceHandler>(&record.gc));
+  reader->setStructureHandler(borrowed<MXFStructureHandler>(record.structure));
+  reader->setMetadataHandler(borrowed<ZeltaMetadataHandler>(record.metadata));
+  reader->setIndexHandler(borrowed<MXFIndexHandler>(record.index));
+  reader->setGCStructureHandler(borrowed<MXFGCStructureHandler>(record.gc));
+  reader->setSDTICPHandler(borrowed<MXFSDTICPSystemHandler>(record.sdticp));
+  reader->setEssenceHandler(borrowed<MXFGCEssenceHandler>(record.gc));
   reader->read();
   return record;
 }

@@ -33,12 +33,6 @@ class SystemDispatch : public MXFGCSystemHandler {
   MXFGCSystemHandler* current_ = nullptr;
 };
 
-// Handlers that the test owns, shared with the reader for the read only.
-template <typename T>
-std::shared_ptr<T> borrowed(T& handler) {
-  return std::shared_ptr<T>(&handler, [](T*) {});
-}
-
 template <typename Read>
 void recordFailure(ReadRecord& record, Read read) {
   try {

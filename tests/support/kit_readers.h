@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -15,6 +16,13 @@
 #include "support/recording.h"
 
 namespace zelta_test {
+
+// A handler that the test owns, lent to a reader or writer that wants it
+// reference-counted.
+template <typename T>
+std::shared_ptr<T> borrowed(T& handler) {
+  return std::shared_ptr<T>(&handler, [](T*) {});
+}
 
 // Lines "start", "end", "model <object count>", "packageItem <size>"; the
 // models kept whole.

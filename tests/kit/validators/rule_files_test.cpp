@@ -120,15 +120,24 @@ ByteVector fileBytes(const FileSpec& spec) {
 }
 
 // What the kit's validators report, as "severity NN text".
-Lines findingsOf(const FileSpec& spec) {
+// The system side of a read: the SDTI-CP handler, which has a validator, or
+// handlers of the generic container and the proxy, which have none.
+enum class SystemSide { sdticp, structureAndProxy };
+
+Lines findingsOf(const FileSpec& spec, SystemSide system = SystemSide::sdticp) {
   const ByteVector bytes = fileBytes(spec);
   auto input = std::make_shared<std::istringstream>(std::string(bytes.begin(), bytes.end()));
   ReadRecord record;
   std::shared_ptr<ZeltaReader> reader = createZeltaReader(input);
-  reader->setStructureHandler(std::shared_ptr<MXFStructureHandler>(&record.structure, [](MXFStructureHandler*) {}));
-  reader->setIndexHandler(std::shared_ptr<MXFIndexHandler>(&record.index, [](MXFIndexHandler*) {}));
-  reader->setSDTICPHandler(std::shared_ptr<MXFSDTICPSystemHandler>(&record.sdticp, [](MXFSDTICPSystemHandler*) {}));
-  reader->setErrorHandler(std::shared_ptr<ErrorHandler>(&record.errors, [](ErrorHandler*) {}));
+  reader->setStructureHandler(borrowed<MXFStructureHandler>(record.structure));
+  reader->setIndexHandler(borrowed<MXFIndexHandler>(record.index));
+  if (system == SystemSide::sdticp) {
+    reader->setSDTICPHandler(borrowed<MXFSDTICPSystemHandler>(record.sdticp));
+  } else {
+    reader->setGCStructureHandler(borrowed<MXFGCStructureHandler>(record.gc));
+    reader->setProxyHandler(borrowed<MXFQMProxySystemHandler>(record.proxy));
+  }
+  reader->setErrorHandler(borrowed<ErrorHandler>(record.errors));
   reader->read();
   EXPECT_FALSE(record.index.segments.empty());
   return kitFindings(record.errors.reports);
@@ -281,6 +290,17 @@ TEST(RuleFiles, UserStampNotPresent) {
               f.partitions[1].essence = concat({systemItem(0x4C), systemItem(0x4C)});
             })),
             Lines{"warning 0E user stamp not present"});
+}
+
+// The file whose system items say that they hold no user stamp: read with
+// the generic container's structure handler and a proxy handler, but no
+// SDTI-CP handler, nothing validates the system items.
+TEST(RuleFiles, GCStructureAndProxyHandlersHaveNoSystemValidation) {
+  const FileSpec file = changed([](FileSpec& f) {
+    f.partitions[1].essence = concat({systemItem(0x4C), systemItem(0x4C)});
+  });
+  EXPECT_EQ(findingsOf(file, SystemSide::structureAndProxy), Lines{});
+  EXPECT_EQ(findingsOf(file), Lines{"warning 0E user stamp not present"});
 }
 
 }  // namespace
