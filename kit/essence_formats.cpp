@@ -11,17 +11,6 @@ namespace zelta {
 
 namespace {
 
-constexpr MXFRational rate23976{24000, 1001};
-constexpr MXFRational rate24{24, 1};
-constexpr MXFRational rate25{25, 1};
-constexpr MXFRational rate2997{30000, 1001};
-constexpr MXFRational rate30{30, 1};
-constexpr MXFRational rate4795{48000, 1001};
-constexpr MXFRational rate48{48, 1};
-constexpr MXFRational rate50{50, 1};
-constexpr MXFRational rate5994{60000, 1001};
-constexpr MXFRational rate60{60, 1};
-
 const std::vector<MXFRational> standardRates{rate25, rate2997};
 const std::vector<MXFRational> mpegRates{rate23976, rate24, rate25, rate2997, rate30, rate50, rate5994, rate60};
 const std::vector<MXFRational> proxyRates{rate23976, rate25, rate2997};
@@ -173,7 +162,9 @@ std::vector<KLVKey> getEssenceContainers(ZeltaEssenceFormat format, std::uint32_
                                          bool hasSound, bool hasData) {
   std::vector<KLVKey> labels{getEssenceContainer(format, bitRate, editRate)};
   if (hasSound && format != ZeltaEssenceFormat::D10) labels.push_back(getSoundContainer(format));
-  if (hasData) labels.push_back(ancillaryDataContainer);
+  // DV's data track is part of the DV container, as the reader's rules
+  // expect.
+  if (hasData && format != ZeltaEssenceFormat::DV) labels.push_back(ancillaryDataContainer);
   if (labels.size() >= 2) labels.push_back(multipleEssenceContainer);
   return labels;
 }

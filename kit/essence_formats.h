@@ -13,6 +13,18 @@
 
 namespace zelta {
 
+// The edit rates of the kit's formats.
+inline constexpr MXFRational rate23976{24000, 1001};
+inline constexpr MXFRational rate24{24, 1};
+inline constexpr MXFRational rate25{25, 1};
+inline constexpr MXFRational rate2997{30000, 1001};
+inline constexpr MXFRational rate30{30, 1};
+inline constexpr MXFRational rate4795{48000, 1001};
+inline constexpr MXFRational rate48{48, 1};
+inline constexpr MXFRational rate50{50, 1};
+inline constexpr MXFRational rate5994{60000, 1001};
+inline constexpr MXFRational rate60{60, 1};
+
 // Equal as cross products; a zero denominator equals no rate.
 bool isSameRate(const MXFRational& a, const MXFRational& b);
 
@@ -29,8 +41,8 @@ void checkEditRate(ZeltaEssenceFormat format, const MXFRational& editRate);
 // format".
 KLVKey getEssenceContainer(ZeltaEssenceFormat format, std::uint32_t bitRate, const MXFRational& editRate);
 // The Preface's list: the picture's container, the sound container unless
-// it is inside the picture's, the data container, and the multiple essence
-// label when that makes two or more.
+// it is inside the picture's, the data container but for DV, and the
+// multiple essence label when that makes two or more.
 std::vector<KLVKey> getEssenceContainers(ZeltaEssenceFormat format, std::uint32_t bitRate, const MXFRational& editRate,
                                          bool hasSound, bool hasData);
 // Container label of a sound descriptor.

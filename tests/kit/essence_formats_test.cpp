@@ -148,10 +148,15 @@ TEST(EssenceFormats, D10SoundIsInsideItsContainer) {
 }
 
 TEST(EssenceFormats, DataAloneMakesTwoLabelsAndTheMultipleLabel) {
-  const std::vector<KLVKey> labels = getEssenceContainers(F::DV, 25000000, {25, 1}, false, true);
+  const std::vector<KLVKey> labels = getEssenceContainers(F::MPEG, 50000000, {25, 1}, false, true);
   ASSERT_EQ(labels.size(), 3u);
   EXPECT_EQ(labels[1], zelta::ancillaryDataContainer);
   EXPECT_EQ(labels[2], zelta::multipleEssenceContainer);
+}
+
+TEST(EssenceFormats, DVDataTrackAddsNoLabelOfItsOwn) {
+  EXPECT_EQ(getEssenceContainers(F::DV, 25000000, {25, 1}, false, true).size(), 1u);
+  EXPECT_EQ(getEssenceContainers(F::DV, 25000000, {25, 1}, true, true).size(), 3u);
 }
 
 TEST(EssenceFormats, OperationalPatterns) {

@@ -8,6 +8,7 @@
 #include "core/failure.h"
 #include "kit.h"
 #include "support/kit_masters.h"
+#include "support/kit_sources.h"
 #include "support/kit_models.h"
 
 using zelta_test::componentOf;
@@ -17,36 +18,13 @@ using zelta_test::masterOf;
 using zelta_test::MasterShape;
 using zelta_test::packageOf;
 using zelta_test::PictureKind;
+using zelta_test::shapeOf;
 
 namespace {
-
-MasterShape shapeOf(ZeltaEssenceFormat format, MXFRational rate, std::uint16_t version, bool sound = true,
-                    bool ancillary = false, PictureKind picture = PictureKind::plain) {
-  MasterShape shape;
-  shape.format = format;
-  shape.editRate = rate;
-  shape.version = version;
-  shape.sound = sound;
-  shape.ancillary = ancillary;
-  shape.picture = picture;
-  return shape;
-}
 
 std::string buildFailure(const std::shared_ptr<const ZeltaMasterMetadata>& master) {
   return failureOf([&] { createZeltaMetadataModel(master); });
 }
-
-// A generator that counts what it handed out.
-class CountingGenerator : public MXFUIDGenerator {
- public:
-  MXFUID generate() override {
-    MXFUID uid;
-    uid[15] = static_cast<std::uint8_t>(++count);
-    uid[14] = static_cast<std::uint8_t>(count >> 8);
-    return uid;
-  }
-  int count = 0;
-};
 
 const std::type_info& pictureClassOf(const Preface& preface) { return typeid(*fileDescriptorsOf(preface).at(0)); }
 
@@ -191,7 +169,7 @@ TEST(ModelBuilderEssences, ReducedAVCHasNoDescriptiveTrackAndNoScheme) {
 // Instance UIDs
 
 TEST(ModelBuilderIdentifiers, EveryObjectTakesAFreshInstanceUIDFromTheGenerator) {
-  auto generator = std::make_shared<CountingGenerator>();
+  auto generator = std::make_shared<zelta_test::CountingGenerator>();
   std::shared_ptr<Preface> preface =
       createZeltaMetadataModel(masterOf(shapeOf(ZeltaEssenceFormat::MPEG, {25, 1}, 259)), generator);
   EXPECT_EQ(preface->getInstanceUID()[15], 1);

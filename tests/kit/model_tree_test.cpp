@@ -296,7 +296,8 @@ TEST(ModelTree, DVWith525LinesTwoChannelsAndItsDataTrack) {
   auto master = masterOf(shapeOf(ZeltaEssenceFormat::DV, {30000, 1001}, true, false));
   std::shared_ptr<Preface> preface = createZeltaMetadataModel(master);
   const Octets container = label(0x01, {0x0D, 0x01, 0x03, 0x01, 0x02, 0x02, 0x01, 0x01});
-  expectPreface(*preface, *master, {container, aes3Container, ancContainer, multipleContainer}, true);
+  // The data track rides in the DV container: no label of its own.
+  expectPreface(*preface, *master, {container, aes3Container, multipleContainer}, true);
   // The data track is numbered as a third sound track of three.
   expectPackages(*preface, *master,
                  {{0x18010100, pictureDefinition},

@@ -165,6 +165,18 @@ std::vector<PictureKind> pictureKinds(ZeltaEssenceFormat format) {
 
 }  // namespace
 
+MasterShape shapeOf(ZeltaEssenceFormat format, MXFRational rate, std::uint16_t version, bool sound, bool ancillary,
+                    PictureKind picture) {
+  MasterShape shape;
+  shape.format = format;
+  shape.editRate = rate;
+  shape.version = version;
+  shape.sound = sound;
+  shape.ancillary = ancillary;
+  shape.picture = picture;
+  return shape;
+}
+
 std::shared_ptr<ZeltaDefaultMetadata> masterOf(const MasterShape& shape) {
   auto m = std::make_shared<ZeltaDefaultMetadata>();
   m->prefaceVersion = shape.version;
@@ -233,14 +245,7 @@ std::vector<MasterShape> masterDomain() {
             for (bool ancillary : {false, true}) {
               // DV always carries its data track.
               if (format == ZeltaEssenceFormat::DV ? !ancillary : ancillary && !ancillaryOptional) continue;
-              MasterShape shape;
-              shape.format = format;
-              shape.editRate = rate;
-              shape.version = version;
-              shape.sound = sound;
-              shape.ancillary = ancillary;
-              shape.picture = kind;
-              shapes.push_back(shape);
+              shapes.push_back(shapeOf(format, rate, version, sound, ancillary, kind));
             }
           }
   }

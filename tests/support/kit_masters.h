@@ -26,6 +26,8 @@ struct MasterShape {
   PictureKind picture = PictureKind::plain;
 };
 
+MasterShape shapeOf(ZeltaEssenceFormat format, MXFRational rate, std::uint16_t version, bool sound = true,
+                    bool ancillary = false, PictureKind picture = PictureKind::plain);
 std::shared_ptr<ZeltaDefaultMetadata> masterOf(const MasterShape& shape);
 std::vector<MasterShape> masterDomain();
 // "MPEG studio 25/1 v259 sound ancillary"

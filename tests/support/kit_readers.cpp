@@ -89,7 +89,11 @@ void readThroughLowerLayers(const std::string& path, ReadRecord& record) {
 }
 
 void readThroughZeltaReader(const std::string& path, ReadRecord& record, bool withErrorHandler) {
-  std::shared_ptr<ZeltaReader> reader = createZeltaReader(std::make_shared<std::ifstream>(path, std::ios::binary));
+  readThroughZeltaReader(std::make_shared<std::ifstream>(path, std::ios::binary), record, withErrorHandler);
+}
+
+void readThroughZeltaReader(const std::shared_ptr<std::istream>& input, ReadRecord& record, bool withErrorHandler) {
+  std::shared_ptr<ZeltaReader> reader = createZeltaReader(input);
   reader->setStructureHandler(borrowed<MXFStructureHandler>(record.structure));
   reader->setMetadataHandler(borrowed<ZeltaMetadataHandler>(record.metadata));
   reader->setIndexHandler(borrowed<MXFIndexHandler>(record.index));

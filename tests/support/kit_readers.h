@@ -65,6 +65,7 @@ void readThroughLowerLayers(const std::string& path, ReadRecord& record);
 // createZeltaReader with every handler set, the error handler only when
 // asked for.
 void readThroughZeltaReader(const std::string& path, ReadRecord& record, bool withErrorHandler);
+void readThroughZeltaReader(const std::shared_ptr<std::istream>& input, ReadRecord& record, bool withErrorHandler);
 
 // "severity identifier message" per report.
 std::vector<std::string> reportLines(const std::vector<Report>& reports);
