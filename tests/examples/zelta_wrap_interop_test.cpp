@@ -1,0 +1,126 @@
+// Files that zelta-wrap writes from inputs made with ffmpeg, read back by
+// ffprobe and ffmpeg: codec, size, rate, duration and channels as made,
+// decoding without a complaint, and the picture and the sound of each
+// channel the same octets as the inputs'.
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "support/run_program.h"
+#include "zelta_wrap_helpers.h"
+
+namespace {
+
+using zelta_test::ProgramRun;
+using zelta_wrap_test::md5Of;
+using zelta_wrap_test::probe;
+using zelta_wrap_test::runWrap;
+using zelta_wrap_test::WrapTest;
+
+// What ffprobe must tell of the picture stream.
+struct PictureProbe {
+  const char* codec;
+  const char* width;
+  const char* height;
+  const char* rate;
+  const char* frames;
+};
+
+class ZeltaWrapInterop : public WrapTest {
+ protected:
+  // A mono WAV of 48 kHz with a tone of its own.
+  void makeTone(const std::string& name, int frequency, const std::string& duration, const std::string& codec) {
+    ffmpeg("-f lavfi -i sine=frequency=" + std::to_string(frequency) + ":sample_rate=48000 -t " + duration + " -c:a " +
+           codec + " " + name);
+  }
+
+  // Wraps; the run succeeds silently and the file is there alone.
+  void wrap(const std::string& arguments) {
+    const ProgramRun run = runWrap(arguments + " -o " + path("out.mxf"));
+    ASSERT_EQ(run.status, 0) << run.err;
+    EXPECT_EQ(run.err, "");
+  }
+
+  void expectPicture(const std::string& input, const PictureProbe& expected) {
+    const std::string out = path("out.mxf");
+    EXPECT_EQ(probe(out, "v:0", "stream=codec_name,width,height,r_frame_rate,nb_read_packets"),
+              std::string(expected.codec) + "\n" + expected.width + "\n" + expected.height + "\n" + expected.rate +
+                  "\n" + expected.frames);
+    const ProgramRun decode = zelta_test::runProgram("ffmpeg -nostdin -v error -i " + out + " -f null -");
+    EXPECT_EQ(decode.status, 0);
+    EXPECT_EQ(decode.err, "");
+    EXPECT_EQ(md5Of("ffmpeg -nostdin -v error -i " + out + " -map 0:v -c copy -f rawvideo -"),
+              md5Of("cat " + path(input)));
+  }
+
+  // The samples of the sound stream equal those of the WAV file.
+  void expectSound(const std::string& stream, const std::string& wav, const std::string& channels,
+                   const std::string& format) {
+    const std::string out = path("out.mxf");
+    EXPECT_EQ(probe(out, stream, "stream=channels"), channels);
+    EXPECT_EQ(md5Of("ffmpeg -nostdin -v error -i " + out + " -map 0:" + stream + " -f " + format + " -"),
+              md5Of("ffmpeg -nostdin -v error -i " + path(wav) + " -f " + format + " -"));
+  }
+
+  void makeD10(const std::string& duration) {
+    ffmpeg("-f lavfi -i testsrc=size=720x608:rate=25 -t " + duration +
+           " -c:v mpeg2video -pix_fmt yuv422p -g 1 -bf 0 -flags +ildct+ilme -top 1 -b:v 50M -minrate 50M -maxrate 50M "
+           "-bufsize 2000000 -rc_init_occupancy 2000000 -f mpeg2video d10.m2v");
+  }
+};
+
+TEST_F(ZeltaWrapInterop, D10WithFourChannelsOfOneFile) {
+  makeD10("0.4");
+  ffmpeg(
+      "-f lavfi -i sine=frequency=440:sample_rate=48000 -f lavfi -i sine=frequency=880:sample_rate=48000 "
+      "-filter_complex [0][1][0][1]amerge=inputs=4 -t 0.4 -c:a pcm_s24le quad.wav");
+  wrap("--format D10 " + path("d10.m2v") + " " + path("quad.wav"));
+  expectPicture("d10.m2v", {"mpeg2video", "720", "608", "25/1", "10"});
+  expectSound("a:0", "quad.wav", "4", "s24le");
+  EXPECT_EQ(probe(path("out.mxf"), "", "format=duration"), "0.400000");
+}
+
+TEST_F(ZeltaWrapInterop, D10WithUnknownDurationAtStart) {
+  makeD10("0.2");
+  makeTone("tone.wav", 1000, "0.2", "pcm_s24le");
+  wrap("--format D10 --unknown-duration " + path("d10.m2v") + " " + path("tone.wav"));
+  expectPicture("d10.m2v", {"mpeg2video", "720", "608", "25/1", "5"});
+  const ProgramRun info = zelta_test::runZeltaInfo("--json " + path("out.mxf"));
+  EXPECT_EQ(info.status, 0) << info.err;
+  EXPECT_NE(info.out.find("\"kind\": \"header\", \"status\": \"open incomplete\""), std::string::npos) << info.out;
+  EXPECT_NE(info.out.find("\"kind\": \"footer\", \"status\": \"closed complete\""), std::string::npos) << info.out;
+}
+
+TEST_F(ZeltaWrapInterop, DVWithTwoMonoFilesOf16Bits) {
+  ffmpeg("-f lavfi -i testsrc=size=720x576:rate=25 -t 0.4 -pix_fmt yuv420p -c:v dvvideo -f dv dv.dv");
+  makeTone("left.wav", 440, "0.4", "pcm_s16le");
+  makeTone("right.wav", 660, "0.4", "pcm_s16le");
+  wrap("--format DV --quantization-bits 16 " + path("dv.dv") + " " + path("left.wav") + " " + path("right.wav"));
+  expectPicture("dv.dv", {"dvvideo", "720", "576", "25/1", "10"});
+  expectSound("a:0", "left.wav", "1", "s16le");
+  expectSound("a:1", "right.wav", "1", "s16le");
+}
+
+TEST_F(ZeltaWrapInterop, MPEGLongGOPWithStartTimecode) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=1920x1080:rate=25 -t 0.96 -c:v mpeg2video -pix_fmt yuv422p -b:v 50M -g 12 -bf 2 "
+      "-flags +ildct+ilme -top 1 -f mpeg2video hd.m2v");
+  makeTone("tone.wav", 1000, "0.96", "pcm_s24le");
+  wrap("--format MPEG --start-timecode 10:00:00:00 " + path("hd.m2v") + " " + path("tone.wav"));
+  expectPicture("hd.m2v", {"mpeg2video", "1920", "1080", "25/1", "24"});
+  expectSound("a:0", "tone.wav", "1", "s24le");
+  EXPECT_EQ(probe(path("out.mxf"), "", "format_tags=timecode"), "10:00:00:00");
+}
+
+TEST_F(ZeltaWrapInterop, AVCVariableWrapping) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=1280x720:rate=50 -t 0.6 -c:v libx264 -pix_fmt yuv422p10le -g 15 -bf 2 -f h264 "
+      "avc.h264");
+  makeTone("tone.wav", 1000, "0.6", "pcm_s24le");
+  wrap("--format AVC " + path("avc.h264") + " " + path("tone.wav"));
+  expectPicture("avc.h264", {"h264", "1280", "720", "50/1", "30"});
+  expectSound("a:0", "tone.wav", "1", "s24le");
+}
+
+}  // namespace
