@@ -123,4 +123,66 @@ TEST_F(ZeltaWrapInterop, AVCVariableWrapping) {
   expectSound("a:0", "tone.wav", "1", "s24le");
 }
 
+TEST_F(ZeltaWrapInterop, D10At30000Over1001PadsFramesAndCountsTheFiveFrameSequence) {
+  // Frames of 30 Mbit/s in the room of 50: each padded to 208541 octets.
+  ffmpeg(
+      "-f lavfi -i testsrc=size=720x512:rate=30000/1001 -t 0.5 -c:v mpeg2video -pix_fmt yuv422p -g 1 -bf 0 "
+      "-flags +ildct+ilme -top 0 -b:v 30M -minrate 30M -maxrate 30M -bufsize 1200000 -rc_init_occupancy 1200000 "
+      "-f mpeg2video ntsc.m2v");
+  // Fifteen frames hold three sequences of 8008 samples.
+  ffmpeg("-f lavfi -i sine=frequency=440:sample_rate=48000 -af atrim=end_sample=24024 -ac 4 -c:a pcm_s24le quad.wav");
+  wrap("--format D10 --drop-frame --start-timecode 01:00:00:00 " + path("ntsc.m2v") + " " + path("quad.wav"));
+  EXPECT_EQ(probe(path("out.mxf"), "v:0", "stream=codec_name,width,height,r_frame_rate,nb_read_packets"),
+            "mpeg2video\n720\n512\n30000/1001\n15");
+  EXPECT_EQ(zelta_test::runProgram("ffmpeg -nostdin -v error -i " + path("out.mxf") + " -f null -").err, "");
+  EXPECT_EQ(probe(path("out.mxf"), "", "format_tags=timecode"), "01:00:00;00");
+  expectSound("a:0", "quad.wav", "4", "s24le");
+  const std::string frames =
+      zelta_test::runProgram("ffprobe -v error -show_entries packet=size -of csv=p=0 -select_streams v " +
+                             path("out.mxf"))
+          .out;
+  EXPECT_EQ(zelta_test::occurrences(frames, "208541\n"), 15u) << frames;
+}
+
+TEST_F(ZeltaWrapInterop, AVCConstantWrappingOfIntraFrames) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=1920x1080:rate=25 -t 0.4 -c:v libx264 -pix_fmt yuv422p10le -x264-params keyint=1 "
+      "-f h264 intra.h264");
+  makeTone("tone.wav", 1000, "0.4", "pcm_s24le");
+  wrap("--format AVC --avc-wrapping constant " + path("intra.h264") + " " + path("tone.wav"));
+  expectPicture("intra.h264", {"h264", "1920", "1080", "25/1", "10"});
+  expectSound("a:0", "tone.wav", "1", "s24le");
+}
+
+TEST_F(ZeltaWrapInterop, MPEGSimpleStudioProfileInFramesOfConstantRoom) {
+  // ffmpeg writes no Simple Studio Profile; an MPEG-4 intra stream stands in for it.
+  ffmpeg("-f lavfi -i testsrc=size=1920x1080:rate=25 -t 0.4 -c:v mpeg4 -g 1 -q:v 3 -f m4v studio.m4v");
+  wrap("--format MPEG --simple-studio-profile --progressive " + path("studio.m4v"));
+  expectPicture("studio.m4v", {"mpeg4", "1920", "1080", "25/1", "10"});
+}
+
+TEST_F(ZeltaWrapInterop, RawFramesReadBackByZeltaInfo) {
+  ffmpeg("-f lavfi -i testsrc=size=1024x720:rate=24 -frames:v 1 -pix_fmt gray -f rawvideo -s 1024x720 one.gray");
+  // Three frames of 737256 octets out of the test picture's octets.
+  ASSERT_EQ(
+      zelta_test::runProgram("cd " + folder_ + " && cat one.gray one.gray one.gray | head -c 2211768 >raw.bin").status,
+      0);
+  makeTone("tone.wav", 1000, "0.125", "pcm_s24le");
+  wrap("--format Raw --raw-code 1073 --size 2048x1080 --rate 24 " + path("raw.bin") + " " + path("tone.wav"));
+  const ProgramRun info = zelta_test::runZeltaInfo("--json --essence --md5 " + path("out.mxf"));
+  EXPECT_EQ(info.status, 0) << info.err;
+  EXPECT_NE(info.out.find("\"essence\": {\"editUnits\": 3,"), std::string::npos) << info.out;
+  const std::string sound = "\"kind\": \"sound\", \"count\": 3, \"bytes\": 18000, \"md5\": \"" +
+                            md5Of("ffmpeg -nostdin -v error -i " + path("tone.wav") + " -f s24le -") + "\"";
+  EXPECT_NE(info.out.find(sound), std::string::npos) << info.out;
+}
+
+TEST_F(ZeltaWrapInterop, ProgressOnATerminal) {
+  makeD10("0.4");
+  const ProgramRun run = zelta_test::runProgram("script -qec '" + std::string(ZELTA_WRAP) + " --format D10 -o " +
+                                                path("out.mxf") + " " + path("d10.m2v") + "' /dev/null");
+  EXPECT_EQ(run.status, 0);
+  EXPECT_EQ(run.out, "\rwrapped 1 frames\rwrapped 10 frames\r\n");
+}
+
 }  // namespace
