@@ -1,8 +1,10 @@
 // zelta-wrap: wraps a picture elementary stream and WAV files into an MXF
 // file through the kit's driver.
 
+#include <sys/stat.h>
 #include <unistd.h>
 
+#include <csignal>
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
@@ -28,6 +30,17 @@ using namespace zelta_wrap;
 // Whether a progress line stands open on stderr.
 bool progressShown = false;
 
+// The file being written, for a signal to remove.
+volatile std::sig_atomic_t temporaryPathSet = 0;
+std::string temporaryPath;
+
+// A signal that ends the program removes the unfinished file first.
+extern "C" void removeTemporary(int signal) {
+  if (temporaryPathSet != 0) unlink(temporaryPath.c_str());
+  std::signal(signal, SIG_DFL);
+  std::raise(signal);
+}
+
 // A file beside the output that becomes it only when complete; removed
 // otherwise.
 class TemporaryOutput {
@@ -35,7 +48,13 @@ class TemporaryOutput {
   explicit TemporaryOutput(const std::string& output) : output_(output), path_(output + ".XXXXXX") {
     const int descriptor = mkstemp(path_.data());
     if (descriptor < 0) throw InputError("cannot write beside " + output);
+    // The file gets the permissions that a plain creation would give it.
+    const mode_t mask = umask(0);
+    umask(mask);
+    fchmod(descriptor, 0666 & ~mask);
     close(descriptor);
+    temporaryPath = path_;
+    temporaryPathSet = 1;
     stream_ = std::make_shared<std::ofstream>(path_, std::ios::binary | std::ios::trunc);
     if (!*stream_) {
       std::remove(path_.c_str());
@@ -43,6 +62,7 @@ class TemporaryOutput {
     }
   }
   ~TemporaryOutput() {
+    temporaryPathSet = 0;
     if (!kept_) std::remove(path_.c_str());
   }
   TemporaryOutput(const TemporaryOutput&) = delete;
@@ -95,6 +115,7 @@ void wrap(const Options& options) {
 
 int main(int argc, char** argv) {
   av_log_set_level(AV_LOG_QUIET);
+  for (int signal : {SIGINT, SIGTERM, SIGHUP}) std::signal(signal, removeTemporary);
   Options options;
   try {
     options = parseOptions(std::vector<std::string>(argv + 1, argv + argc));
