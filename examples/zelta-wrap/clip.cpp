@@ -372,6 +372,10 @@ Clip decideClip(const Options& options, const PictureFacts& facts, std::uint32_t
 std::shared_ptr<ZeltaMasterMetadata> createMaster(const Options& options, const Clip& clip, const PictureFacts& facts,
                                                   const std::shared_ptr<const Progress>& progress) {
   auto m = std::make_shared<ZeltaDefaultMetadata>();
+  // The driver's own choice, given here so that the model built ahead is the
+  // one that the driver builds.
+  const bool labelled = clip.format == ZeltaEssenceFormat::D10 || clip.format == ZeltaEssenceFormat::DV;
+  m->prefaceVersion = labelled ? 0x0102 : 0x0103;
   m->identification.companyName = L"Orvane";
   m->identification.productName = L"zelta-wrap";
   m->identification.productVersion = getZeltaToolkitVersion();

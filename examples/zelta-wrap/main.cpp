@@ -98,6 +98,13 @@ void wrap(const Options& options) {
   const Clip clip = decideClip(options, facts, soundChannels);
   auto progress = std::make_shared<Progress>();
   std::shared_ptr<ZeltaMasterMetadata> master = createMaster(options, clip, facts, progress);
+  // The model that the driver will build, built once ahead so that a clip
+  // that the kit can't describe is refused before the output exists.
+  try {
+    createZeltaMetadataModel(master);
+  } catch (const std::exception& e) {
+    throw InputError(std::string("cannot describe the clip: ") + e.what());
+  }
   const bool terminal = isatty(STDERR_FILENO) != 0;
   auto source = std::make_shared<WrapSource>(options, clip, master, progress, [terminal](std::uint64_t count) {
     if (!terminal || count % 25 != 1) return;

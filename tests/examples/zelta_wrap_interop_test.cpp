@@ -113,6 +113,31 @@ TEST_F(ZeltaWrapInterop, MPEGLongGOPWithStartTimecode) {
   EXPECT_EQ(probe(path("out.mxf"), "", "format_tags=timecode"), "10:00:00:00");
 }
 
+TEST_F(ZeltaWrapInterop, MPEGWithUnknownDurationAtStart) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=1920x1080:rate=25 -t 0.96 -c:v mpeg2video -pix_fmt yuv422p -b:v 50M -g 12 -bf 2 "
+      "-flags +ildct+ilme -top 1 -f mpeg2video hd.m2v");
+  wrap("--format MPEG --unknown-duration " + path("hd.m2v"));
+  expectPicture("hd.m2v", {"mpeg2video", "1920", "1080", "25/1", "24"});
+  const ProgramRun info = zelta_test::runZeltaInfo("--json " + path("out.mxf"));
+  EXPECT_EQ(info.status, 0) << info.err;
+  EXPECT_NE(info.out.find("\"kind\": \"header\", \"status\": \"open incomplete\""), std::string::npos) << info.out;
+  EXPECT_NE(info.out.find("\"kind\": \"footer\", \"status\": \"closed complete\""), std::string::npos) << info.out;
+}
+
+TEST_F(ZeltaWrapInterop, SoundThatEndsEarlyGoesOnInSilenceAndLongerSoundIsCut) {
+  ffmpeg("-f lavfi -i testsrc=size=720x576:rate=25 -t 0.4 -pix_fmt yuv420p -c:v dvvideo -f dv dv.dv");
+  makeTone("short.wav", 440, "0.2", "pcm_s24le");
+  makeTone("long.wav", 660, "0.6", "pcm_s24le");
+  wrap("--format DV " + path("dv.dv") + " " + path("short.wav") + " " + path("long.wav"));
+  // Ten frames of 1920 samples.
+  const std::string out = "ffmpeg -nostdin -v error -i " + path("out.mxf");
+  EXPECT_EQ(md5Of(out + " -map 0:a:0 -f s24le -"),
+            md5Of("ffmpeg -nostdin -v error -i " + path("short.wav") + " -af apad=whole_len=19200 -f s24le -"));
+  EXPECT_EQ(md5Of(out + " -map 0:a:1 -f s24le -"),
+            md5Of("ffmpeg -nostdin -v error -i " + path("long.wav") + " -af atrim=end_sample=19200 -f s24le -"));
+}
+
 TEST_F(ZeltaWrapInterop, AVCVariableWrapping) {
   ffmpeg(
       "-f lavfi -i testsrc=size=1280x720:rate=50 -t 0.6 -c:v libx264 -pix_fmt yuv422p10le -g 15 -bf 2 -f h264 "

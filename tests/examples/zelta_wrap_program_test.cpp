@@ -100,6 +100,13 @@ TEST_F(ZeltaWrapRefusal, RateThatTheFormatLacks) {
   expectRefused("--format D10 --rate 50 -o " + path("out.mxf") + " " + path("d10.m2v"), "D10 has no rate 50");
 }
 
+TEST_F(ZeltaWrapRefusal, ClipThatTheKitCannotDescribe) {
+  // The kit's long GOP MPEG pictures are high definition.
+  ffmpeg("-f lavfi -i testsrc=size=720x576:rate=25 -t 0.2 -c:v mpeg2video -pix_fmt yuv420p -f mpeg2video sd.m2v");
+  expectRefused("--format MPEG -o " + path("out.mxf") + " " + path("sd.m2v"),
+                "cannot describe the clip: assertion failure: recognized displayHeight");
+}
+
 TEST_F(ZeltaWrapRefusal, PictureThatCannotBeRead) {
   expectRefused("--format DV -o " + path("out.mxf") + " " + path("absent.dv"), "cannot read " + path("absent.dv"));
 }
