@@ -10,7 +10,8 @@
 namespace zelta_wrap {
 
 const char* const usage =
-    "usage: zelta-wrap --format D10|DV|MPEG|AVC|Raw [OPTIONS] -o OUT.mxf PICTURE [SOUND.wav ...]\n"
+    "usage: zelta-wrap --format D10|DV|MPEG|AVC|Raw [OPTIONS] -o OUT.mxf PICTURE\n"
+    "                  [SOUND.wav ...]\n"
     "\n"
     "Wraps the picture elementary stream PICTURE and the WAV files SOUND.wav\n"
     "into the MXF file OUT.mxf through the Zelta driver. Every channel of every\n"
