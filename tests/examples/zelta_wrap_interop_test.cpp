@@ -96,10 +96,14 @@ TEST_F(ZeltaWrapInterop, DVWithTwoMonoFilesOf16Bits) {
   ffmpeg("-f lavfi -i testsrc=size=720x576:rate=25 -t 0.4 -pix_fmt yuv420p -c:v dvvideo -f dv dv.dv");
   makeTone("left.wav", 440, "0.4", "pcm_s16le");
   makeTone("right.wav", 660, "0.4", "pcm_s16le");
-  wrap("--format DV --quantization-bits 16 " + path("dv.dv") + " " + path("left.wav") + " " + path("right.wav"));
+  wrap("--format DV --quantization-bits 16 --package-name 'clip \u00e9' " + path("dv.dv") + " " + path("left.wav") +
+       " " + path("right.wav"));
   expectPicture("dv.dv", {"dvvideo", "720", "576", "25/1", "10"});
   expectSound("a:0", "left.wav", "1", "s16le");
   expectSound("a:1", "right.wav", "1", "s16le");
+  const ProgramRun info = zelta_test::runZeltaInfo("--master " + path("out.mxf"));
+  EXPECT_NE(info.out.find("  packageName: clip \u00e9\n"), std::string::npos) << info.out;
+  EXPECT_NE(info.out.find("  audioChannelCount: 2\n  quantizationBits: 16\n"), std::string::npos) << info.out;
 }
 
 TEST_F(ZeltaWrapInterop, MPEGLongGOPWithStartTimecode) {

@@ -196,6 +196,49 @@ TEST(ZeltaWrapSoundLayout, D10ElementOfAFullFrameHasTheDriversLength) {
   EXPECT_EQ(element.size(), parameters.getElementLength(0));
 }
 
+TEST(ZeltaWrapClip, OptionValuesThatTheFormatRefuses) {
+  EXPECT_EQ(failureOf<InputError>([] {
+              zelta_wrap::checkOptions(parse({"--format", "D10", "--rate", "50", "-o", "o", "i"}));
+            }),
+            "D10 has no rate 50");
+  EXPECT_EQ(failureOf<InputError>([] {
+              zelta_wrap::checkOptions(parse({"--format", "MPEG", "--rate", "48", "-o", "o", "i"}));
+            }),
+            "MPEG has no rate 48");
+  EXPECT_EQ(failureOf<InputError>([] {
+              zelta_wrap::checkOptions(parse({"--format", "DV", "--progressive", "-o", "o", "i"}));
+            }),
+            "DV is interlaced");
+  EXPECT_EQ(failureOf<InputError>([] {
+              zelta_wrap::checkOptions(parse({"--format", "Raw", "--interlaced", "-o", "o", "i"}));
+            }),
+            "Raw is progressive");
+  EXPECT_EQ(failureOf<InputError>([] {
+              zelta_wrap::checkOptions(parse({"--format", "DV", "--rate", "25", "--drop-frame", "-o", "o", "i"}));
+            }),
+            "--drop-frame needs the rate 30000/1001 or 60000/1001");
+  EXPECT_EQ(failureOf<InputError>([] {
+              zelta_wrap::checkOptions(
+                  parse({"--format", "DV", "--rate", "25", "--start-timecode", "00:00:00:25", "-o", "o", "i"}));
+            }),
+            "invalid value for --start-timecode at rate 25");
+  EXPECT_EQ(failureOf<InputError>([] {
+              zelta_wrap::checkOptions(parse({"--format", "Raw", "--raw-code", "786", "-o", "o", "i"}));
+            }),
+            "invalid value for --raw-code: 786 at width 4096");
+}
+
+TEST(ZeltaWrapClip, OptionValuesThatTheFormatTakes) {
+  EXPECT_EQ(
+      failureOf<InputError>([] {
+        zelta_wrap::checkOptions(parse({"--format", "Raw", "--rate", "48000/1001", "--progressive", "-o", "o", "i"}));
+        zelta_wrap::checkOptions(parse({"--format", "D10", "--rate", "30000/1001", "--drop-frame", "--start-timecode",
+                                        "00:01:00:02", "-o", "o", "i"}));
+        zelta_wrap::checkOptions(parse({"--format", "AVC", "--rate", "60000/1001", "--interlaced", "-o", "o", "i"}));
+      }),
+      "");
+}
+
 TEST(ZeltaWrapClip, RawFrameSizes) {
   EXPECT_EQ(zelta_wrap::getRawFrameSize(801, 4096), 10190824u);
   EXPECT_EQ(zelta_wrap::getRawFrameSize(0, 4096), 10190824u);
