@@ -42,13 +42,14 @@ bool sameRate(const MXFRational& a, const MXFRational& b) {
 }
 bool is625(const MXFRational& rate) { return sameRate(rate, {25, 1}); }
 bool is525(const MXFRational& rate) { return sameRate(rate, {30000, 1001}); }
-bool isFilmOrHigh(const MXFRational& rate) { return sameRate(rate, {48000, 1001}) || sameRate(rate, {48, 1}); }
+// Only Raw has the 48 frame rates.
+bool is48(const MXFRational& rate) { return sameRate(rate, {48000, 1001}) || sameRate(rate, {48, 1}); }
 
 bool allows(ZeltaEssenceFormat format, const MXFRational& rate) {
   if (format == ZeltaEssenceFormat::D10 || format == ZeltaEssenceFormat::DV) return is625(rate) || is525(rate);
   const bool listed =
       std::any_of(allRates.begin(), allRates.end(), [&](const MXFRational& r) { return sameRate(r, rate); });
-  return listed && (format == ZeltaEssenceFormat::Raw || !isFilmOrHigh(rate));
+  return listed && (format == ZeltaEssenceFormat::Raw || !is48(rate));
 }
 
 std::string rateText(const MXFRational& rate) {
@@ -71,10 +72,10 @@ MXFRational decideRate(const Options& options, const PictureFacts& facts) {
 std::uint32_t decideBitRate(const Options& options, const PictureFacts& facts) {
   const bool studio = options.format == ZeltaEssenceFormat::MPEG && options.simpleStudioProfile;
   if (options.format == ZeltaEssenceFormat::D10) {
-    const std::uint32_t bitRate = options.bitRate.value_or(50000000);
-    if (bitRate != 30000000 && bitRate != 40000000 && bitRate != 50000000)
+    auto isD10 = [](std::int64_t bitRate) { return bitRate == 30000000 || bitRate == 40000000 || bitRate == 50000000; };
+    if (options.bitRate && !isD10(*options.bitRate))
       throw InputError("invalid value for --bit-rate: D10 has 30, 40 or 50 Mbit/s");
-    return bitRate;
+    return options.bitRate.value_or(isD10(facts.bitRate) ? static_cast<std::uint32_t>(facts.bitRate) : 50000000);
   }
   if (options.format == ZeltaEssenceFormat::DV) return 25000000;
   if (options.bitRate) return *options.bitRate;
@@ -314,7 +315,6 @@ PictureFacts scanPicture(PictureInput& input) {
   if (const MediaFile* media = input.getMedia()) {
     const AVCodecParameters& p = media->getParameters();
     const AVStream& stream = media->getStream();
-    facts.demuxed = true;
     AVRational rate = stream.avg_frame_rate.num > 0 ? stream.avg_frame_rate : stream.r_frame_rate;
     if (rate.num > 0 && rate.den > 0) facts.rate = {rate.num, rate.den};
     facts.width = p.width;

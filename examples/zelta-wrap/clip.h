@@ -23,7 +23,6 @@ struct PictureFacts {
   std::uint16_t longestGOP = 0;
   std::uint16_t longestBRun = 0;
   bool identicalGOPs = true;
-  bool demuxed = false;
   // What the demuxer tells, when it read the input.
   MXFRational rate;
   int width = 0;

@@ -48,7 +48,7 @@ class WrapSource : public ZeltaSource {
   static std::shared_ptr<ZeltaBuffer> lend(const std::vector<std::uint8_t>& octets);
   void readSound();
 
-  const Clip& clip_;
+  const Clip clip_;
   bool constantAVC_;
   std::shared_ptr<ZeltaMasterMetadata> master_;
   std::shared_ptr<Progress> progress_;

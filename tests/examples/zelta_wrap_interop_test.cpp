@@ -92,6 +92,17 @@ TEST_F(ZeltaWrapInterop, D10WithUnknownDurationAtStart) {
   EXPECT_NE(info.out.find("\"kind\": \"footer\", \"status\": \"closed complete\""), std::string::npos) << info.out;
 }
 
+TEST_F(ZeltaWrapInterop, D10TakesTheBitRateOfItsInput) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=720x608:rate=25 -t 0.2 -c:v mpeg2video -pix_fmt yuv422p -g 1 -bf 0 "
+      "-flags +ildct+ilme -top 1 -b:v 30M -minrate 30M -maxrate 30M -bufsize 1200000 -rc_init_occupancy 1200000 "
+      "-f mpeg2video d10.m2v");
+  wrap("--format D10 " + path("d10.m2v"));
+  expectPicture("d10.m2v", {"mpeg2video", "720", "608", "25/1", "5"});
+  const ProgramRun info = zelta_test::runZeltaInfo("--master " + path("out.mxf"));
+  EXPECT_NE(info.out.find("  bitRate: 30000000\n"), std::string::npos) << info.out;
+}
+
 TEST_F(ZeltaWrapInterop, DVWithTwoMonoFilesOf16Bits) {
   ffmpeg("-f lavfi -i testsrc=size=720x576:rate=25 -t 0.4 -pix_fmt yuv420p -c:v dvvideo -f dv dv.dv");
   makeTone("left.wav", 440, "0.4", "pcm_s16le");
@@ -160,7 +171,8 @@ TEST_F(ZeltaWrapInterop, D10At30000Over1001PadsFramesAndCountsTheFiveFrameSequen
       "-f mpeg2video ntsc.m2v");
   // Fifteen frames hold three sequences of 8008 samples.
   ffmpeg("-f lavfi -i sine=frequency=440:sample_rate=48000 -af atrim=end_sample=24024 -ac 4 -c:a pcm_s24le quad.wav");
-  wrap("--format D10 --drop-frame --start-timecode 01:00:00:00 " + path("ntsc.m2v") + " " + path("quad.wav"));
+  wrap("--format D10 --bit-rate 50 --drop-frame --start-timecode 01:00:00:00 " + path("ntsc.m2v") + " " +
+       path("quad.wav"));
   EXPECT_EQ(probe(path("out.mxf"), "v:0", "stream=codec_name,width,height,r_frame_rate,nb_read_packets"),
             "mpeg2video\n720\n512\n30000/1001\n15");
   EXPECT_EQ(zelta_test::runProgram("ffmpeg -nostdin -v error -i " + path("out.mxf") + " -f null -").err, "");
