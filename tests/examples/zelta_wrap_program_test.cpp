@@ -95,6 +95,14 @@ TEST_F(ZeltaWrapRefusal, SoundOfAnotherBitDepth) {
                 path("s16.wav") + " has 16 bit samples, not 24");
 }
 
+TEST_F(ZeltaWrapRefusal, MoreThanEightChannelsForD10) {
+  makeD10();
+  ffmpeg("-f lavfi -i sine=sample_rate=48000 -t 0.2 -ac 3 -c:a pcm_s24le three.wav");
+  const std::string three = " " + path("three.wav");
+  expectRefused("--format D10 -o " + path("out.mxf") + " " + path("d10.m2v") + three + three + three,
+                "D10 carries at most 8 sound channels, not 9");
+}
+
 TEST_F(ZeltaWrapRefusal, RateThatTheFormatLacks) {
   makeD10();
   expectRefused("--format D10 --rate 50 -o " + path("out.mxf") + " " + path("d10.m2v"), "D10 has no rate 50");
