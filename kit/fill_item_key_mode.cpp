@@ -23,7 +23,12 @@ FillItemKeyModeStructureFilter::FillItemKeyModeStructureFilter(MXFStructureHandl
 
 void FillItemKeyModeStructureFilter::setRunIn(std::uint32_t runIn) { handler_->setRunIn(runIn); }
 void FillItemKeyModeStructureFilter::startStream() { handler_->startStream(); }
-void FillItemKeyModeStructureFilter::endStream(bool aborted) { handler_->endStream(aborted); }
+// The file's last octets reach the stream's own buffer when the file ends.
+void FillItemKeyModeStructureFilter::endStream(bool aborted) {
+  handler_->endStream(aborted);
+  stream_.flush();
+  util::requireWritten(stream_);
+}
 
 // The header partition decides, unless the stream has a mode already.
 void FillItemKeyModeStructureFilter::startPartition(const KLVKey& key, const MXFPartitionPack& pack,

@@ -1,5 +1,6 @@
 // Fill items in the key form of the kind of file being written: the header
-// partition decides for the whole file.
+// partition decides for the whole file. When the file ends, what the stream
+// holds back is sent on.
 #ifndef ZELTA_KIT_FILL_ITEM_KEY_MODE_H
 #define ZELTA_KIT_FILL_ITEM_KEY_MODE_H
 

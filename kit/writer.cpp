@@ -5,6 +5,7 @@
 #include "kit/fill_item_key_mode.h"
 #include "kit/metadata_coder.h"
 #include "kit/system_coder.h"
+#include "kit/write_gatherer.h"
 
 namespace {
 
@@ -13,8 +14,9 @@ class ZeltaWriterImpl : public ZeltaWriter {
  public:
   explicit ZeltaWriterImpl(const std::shared_ptr<std::ostream>& output)
       : output_(output),
-        writer_(*output),
-        structureFilter_(writer_.getStructureHandler(), *output),
+        gathered_(*output),
+        writer_(gathered_),
+        structureFilter_(writer_.getStructureHandler(), gathered_),
         factory_(createZeltaDefaultMetadataFactory()),
         metadataCoder_(writer_.getMetadataHandler(), factory_),
         indexCoder_(writer_.getIndexHandler()),
@@ -36,8 +38,15 @@ class ZeltaWriterImpl : public ZeltaWriter {
   MXFGCEssenceHandler* getEssenceHandler() override { return essenceCoder_.getEssenceHandler(); }
   MXFWriter* getMXFWriter() override { return &writer_; }
 
+  // What is gathered reaches the client's stream.
+  void flush() {
+    gathered_.flush();
+    util::requireWritten(gathered_);
+  }
+
  private:
   std::shared_ptr<std::ostream> output_;
+  zelta::GatheringStream gathered_;
   MXFWriter writer_;
   FillItemKeyModeStructureFilter structureFilter_;
   std::shared_ptr<MXFMetadataModelFactory> factory_;
@@ -55,6 +64,7 @@ class VerifyingZeltaWriterImpl : public VerifyingZeltaWriter {
       : writer_(std::make_shared<ZeltaWriterImpl>(stream)), verifier_(*stream, writer_->getMXFWriter()->getHandler()) {}
 
   void setVerifying(bool verifying) override {
+    writer_->flush();
     if (verifying)
       writer_->getMXFWriter()->setHandler(&verifier_);
     else
