@@ -90,6 +90,11 @@ TEST_F(ZeltaWrapInterop, D10WithUnknownDurationAtStart) {
   EXPECT_EQ(info.status, 0) << info.err;
   EXPECT_NE(info.out.find("\"kind\": \"header\", \"status\": \"open incomplete\""), std::string::npos) << info.out;
   EXPECT_NE(info.out.find("\"kind\": \"footer\", \"status\": \"closed complete\""), std::string::npos) << info.out;
+  // The footer's metadata and index give the duration to the other tools.
+  EXPECT_EQ(probe(path("out.mxf"), "", "format=duration"), "0.200000");
+  const ProgramRun mediainfo =
+      zelta_test::runProgram("mediainfo --Inform='General;%Duration%|%FrameCount%' " + path("out.mxf"));
+  EXPECT_EQ(mediainfo.out, "200|5\n");
 }
 
 TEST_F(ZeltaWrapInterop, D10TakesTheBitRateOfItsInput) {
