@@ -7,6 +7,7 @@
 
 #include <string>
 
+#include "support/kit_readers.h"
 #include "support/run_program.h"
 #include "zelta_wrap_helpers.h"
 
@@ -27,6 +28,8 @@ struct PictureProbe {
   const char* frames;
 };
 
+const std::string openHeader = "warning 04 open or incomplete partition status";
+
 class ZeltaWrapInterop : public WrapTest {
  protected:
   // A mono WAV of 48 kHz with a tone of its own.
@@ -35,11 +38,21 @@ class ZeltaWrapInterop : public WrapTest {
            codec + " " + name);
   }
 
-  // Wraps; the run succeeds silently and the file is there alone.
-  void wrap(const std::string& arguments) {
+  // Wraps; the run succeeds silently, the kit's reader reports in the file
+  // no more than the findings given, and mediainfo and GStreamer read it.
+  void wrap(const std::string& arguments, const std::vector<std::string>& findings = {}) {
     const ProgramRun run = runWrap(arguments + " -o " + path("out.mxf"));
     ASSERT_EQ(run.status, 0) << run.err;
     EXPECT_EQ(run.err, "");
+    zelta_test::ReadRecord record;
+    zelta_test::readThroughZeltaReader(path("out.mxf"), record, true);
+    EXPECT_EQ(record.failure, "");
+    EXPECT_EQ(zelta_test::kitFindings(record.errors.reports), findings);
+    EXPECT_EQ(zelta_test::withoutKitReports(record.errors.reports).size(), 0U);
+    const ProgramRun info = zelta_test::runProgram("mediainfo " + path("out.mxf"));
+    EXPECT_NE(info.out.find("Format                                   : MXF"), std::string::npos) << info.out;
+    const ProgramRun discover = zelta_test::runProgram("gst-discoverer-1.0 " + path("out.mxf"));
+    EXPECT_EQ(discover.status, 0) << discover.out << discover.err;
   }
 
   void expectPicture(const std::string& input, const PictureProbe& expected) {
@@ -84,7 +97,8 @@ TEST_F(ZeltaWrapInterop, D10WithFourChannelsOfOneFile) {
 TEST_F(ZeltaWrapInterop, D10WithUnknownDurationAtStart) {
   makeD10("0.2");
   makeTone("tone.wav", 1000, "0.2", "pcm_s24le");
-  wrap("--format D10 --unknown-duration " + path("d10.m2v") + " " + path("tone.wav"));
+  // The kit's reader warns of the open header, as of any.
+  wrap("--format D10 --unknown-duration " + path("d10.m2v") + " " + path("tone.wav"), {openHeader});
   expectPicture("d10.m2v", {"mpeg2video", "720", "608", "25/1", "5"});
   const ProgramRun info = zelta_test::runZeltaInfo("--json " + path("out.mxf"));
   EXPECT_EQ(info.status, 0) << info.err;
@@ -137,7 +151,7 @@ TEST_F(ZeltaWrapInterop, MPEGWithUnknownDurationAtStart) {
   ffmpeg(
       "-f lavfi -i testsrc=size=1920x1080:rate=25 -t 0.96 -c:v mpeg2video -pix_fmt yuv422p -b:v 50M -g 12 -bf 2 "
       "-flags +ildct+ilme -top 1 -f mpeg2video hd.m2v");
-  wrap("--format MPEG --unknown-duration " + path("hd.m2v"));
+  wrap("--format MPEG --unknown-duration " + path("hd.m2v"), {openHeader});
   expectPicture("hd.m2v", {"mpeg2video", "1920", "1080", "25/1", "24"});
   const ProgramRun info = zelta_test::runZeltaInfo("--json " + path("out.mxf"));
   EXPECT_EQ(info.status, 0) << info.err;
