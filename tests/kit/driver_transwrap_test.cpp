@@ -48,9 +48,11 @@ std::string pictureAndSoundHashes(const std::string& path) {
   return kept;
 }
 
+// A copy of the test's own, as tests may run side by side.
 std::string transwrapped(const std::string& name) {
   auto source = std::make_shared<TranswrapSource>(dataPath(name));
-  const std::string path = testing::TempDir() + "zelta_transwrap_" + name;
+  const std::string test = ::testing::UnitTest::GetInstance()->current_test_info()->name();
+  const std::string path = testing::TempDir() + "zelta_transwrap_" + test + "_" + name;
   auto out = std::make_shared<std::ofstream>(path, std::ios::binary);
   createZeltaDriver(source)->drive(createZeltaWriter(out));
   out->close();
