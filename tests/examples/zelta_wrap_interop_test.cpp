@@ -246,3 +246,64 @@ TEST_F(ZeltaWrapInterop, ProgressOnATerminal) {
 }
 
 }  // namespace
+
+TEST_F(ZeltaWrapInterop, D10At30MbitWithEightChannelsOfOneFile) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=720x608:rate=25 -t 0.2 -c:v mpeg2video -pix_fmt yuv422p -g 1 -bf 0 -flags +ildct+ilme "
+      "-top 1 -b:v 30M -minrate 30M -maxrate 30M -bufsize 1200000 -rc_init_occupancy 1200000 -f mpeg2video d10.m2v");
+  ffmpeg("-f lavfi -i sine=frequency=440:sample_rate=48000 -t 0.2 -ac 8 -c:a pcm_s24le octo.wav");
+  wrap("--format D10 " + path("d10.m2v") + " " + path("octo.wav"));
+  expectPicture("d10.m2v", {"mpeg2video", "720", "608", "25/1", "5"});
+  expectSound("a:0", "octo.wav", "8", "s24le");
+  const ProgramRun info =
+      zelta_test::runProgram("mediainfo --Inform='Video;%Format_Commercial_IfAny%' " + path("out.mxf"));
+  EXPECT_EQ(info.out, "IMX 30\n");
+}
+
+TEST_F(ZeltaWrapInterop, DVAt30000Over1001WithTwoChannelsOfOneFile) {
+  ffmpeg("-f lavfi -i testsrc=size=720x480:rate=30000/1001 -t 0.4 -pix_fmt yuv411p -c:v dvvideo -f dv ntsc.dv");
+  ffmpeg("-f lavfi -i sine=frequency=440:sample_rate=48000 -t 0.4 -ac 2 -c:a pcm_s16le stereo.wav");
+  wrap("--format DV --quantization-bits 16 " + path("ntsc.dv") + " " + path("stereo.wav"));
+  expectPicture("ntsc.dv", {"dvvideo", "720", "480", "30000/1001", "12"});
+  EXPECT_EQ(probe(path("out.mxf"), "v:0", "stream=field_order"), "bb");
+  EXPECT_EQ(probe(path("out.mxf"), "a", "stream=channels"), "1\n1");
+}
+
+// 720 lines at 50 frames, in GOPs of twelve, open and closed.
+TEST_F(ZeltaWrapInterop, MPEG720pAt50OfOpenAndClosedGOPs) {
+  for (const bool closed : {false, true}) {
+    SCOPED_TRACE(closed);
+    ffmpeg(std::string("-f lavfi -i testsrc=size=1280x720:rate=50 -t 0.96 -c:v mpeg2video -pix_fmt yuv422p -b:v 50M ") +
+           "-g 12 -bf 2 " + (closed ? "-flags +cgop -sc_threshold 1000000000 " : "") + "-f mpeg2video p50.m2v");
+    makeTone("tone.wav", 1000, "0.96", "pcm_s24le");
+    wrap("--format MPEG --progressive " + std::string(closed ? "--closed-gop " : "") + path("p50.m2v") + " " +
+         path("tone.wav"));
+    expectPicture("p50.m2v", {"mpeg2video", "1280", "720", "50/1", "48"});
+    expectSound("a:0", "tone.wav", "1", "s24le");
+    const ProgramRun info =
+        zelta_test::runProgram("mediainfo --Inform='Video;%Format_Commercial_IfAny%' " + path("out.mxf"));
+    EXPECT_EQ(info.out, "XDCAM HD422\n");
+  }
+}
+
+TEST_F(ZeltaWrapInterop, AVCIntra100Of1080InterlacedLinesAtConstantSize) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=1920x1080:rate=25 -t 0.4 -c:v libx264 -avcintra-class 100 -pix_fmt yuv422p10le "
+      "-flags +ildct+ilme -f h264 avci.h264");
+  makeTone("tone.wav", 1000, "0.4", "pcm_s24le");
+  wrap("--format AVC --avc-wrapping constant --interlaced " + path("avci.h264") + " " + path("tone.wav"));
+  expectPicture("avci.h264", {"h264", "1920", "1080", "25/1", "10"});
+  EXPECT_EQ(probe(path("out.mxf"), "v:0", "stream=field_order"), "tt");
+  expectSound("a:0", "tone.wav", "1", "s24le");
+  const ProgramRun info = zelta_test::runProgram("mediainfo --Inform='Video;%Format_Profile%' " + path("out.mxf"));
+  EXPECT_EQ(info.out, "High 4:2:2 Intra@L4.1\n");
+}
+
+TEST_F(ZeltaWrapInterop, AVCLongGOPWithUnknownDurationAtStart) {
+  ffmpeg(
+      "-f lavfi -i testsrc=size=1280x720:rate=50 -t 0.6 -c:v libx264 -pix_fmt yuv422p10le -g 15 -bf 2 -f h264 "
+      "avc.h264");
+  wrap("--format AVC --unknown-duration " + path("avc.h264"), {openHeader});
+  expectPicture("avc.h264", {"h264", "1280", "720", "50/1", "30"});
+  EXPECT_EQ(probe(path("out.mxf"), "", "format=duration"), "0.600000");
+}
