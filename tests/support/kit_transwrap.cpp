@@ -39,13 +39,17 @@ std::shared_ptr<ZeltaBuffer> bufferOf(const ByteVector& bytes) { return std::mak
 
 TranswrapSource::TranswrapSource(const std::string& path) {
   RecordingZeltaMetadataHandler metadata;
+  RecordingIndexHandler index;
   UnitCollector collector(units_);
   std::shared_ptr<ZeltaReader> reader = createZeltaReader(std::make_shared<std::ifstream>(path, std::ios::binary));
   reader->setMetadataHandler(borrowed<ZeltaMetadataHandler>(metadata));
+  reader->setIndexHandler(borrowed<MXFIndexHandler>(index));
   reader->setGCStructureHandler(borrowed<MXFGCStructureHandler>(collector));
   reader->setEssenceHandler(borrowed<MXFGCEssenceHandler>(collector));
   reader->read();
   check(!metadata.models.empty() && !metadata.models.front().empty(), "model has a Preface");
+  for (const MXFIndexTableSegment& segment : index.segments)
+    if (segment.editUnitByteCount != 0) constantSize_ = true;
   master_ = createZeltaMasterMetadata(std::dynamic_pointer_cast<const Preface>(metadata.models.front().front()));
 }
 

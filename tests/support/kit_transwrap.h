@@ -28,8 +28,8 @@ class TranswrapSource : public ZeltaSource {
   std::shared_ptr<MXFUIDGenerator> getUIDGenerator() override { return nullptr; }
   bool hasPictureMetadata() override { return false; }
   bool isIndexDeferred() override { return false; }
-  // The file's own AVC is long GOP.
-  std::uint32_t getAVCWrapping() override { return 0; }
+  // Constant size frames when the file's index counts octets per edit unit.
+  std::uint32_t getAVCWrapping() override { return constantSize_ ? 1 : 0; }
   bool hasMoreEditUnits() override { return next_ < units_.size(); }
   MXFSDTICPTimeStamp getUserStamp() override { return MXFSDTICPTimeStamp{}; }
   MXFGCLocalItems getPackageMetadata() override { return {}; }
@@ -53,6 +53,7 @@ class TranswrapSource : public ZeltaSource {
   std::shared_ptr<const ZeltaMasterMetadata> master_;
   std::vector<UnitEssence> units_;
   std::size_t next_ = 0;
+  bool constantSize_ = false;
 };
 
 }  // namespace zelta_test
