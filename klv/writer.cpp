@@ -10,9 +10,11 @@ bool isLongForm(std::uint8_t form) { return form > KLVNoLengthForm; }
 // True when the number needs no more than the octets; eight always do.
 bool fitsIn(std::uint64_t number, unsigned octets) { return octets >= 8 || (number >> (8 * octets)) == 0; }
 
-// Numbers are short: they go octet by octet, high octet first.
+// High octet first, in one write.
 void putNumber(std::ostream& stream, std::uint64_t number, unsigned octets) {
-  for (unsigned i = octets; i-- > 0;) util::putOctet(stream, static_cast<std::uint8_t>(number >> (8 * i)));
+  char bytes[8];
+  for (unsigned i = 0; i < octets; ++i) bytes[i] = static_cast<char>(number >> (8 * (octets - 1 - i)));
+  stream.write(bytes, octets);
   util::requireWritten(stream);
 }
 
@@ -47,8 +49,12 @@ void GenericKLVWriter::writeBERLength(std::uint64_t length) {
     const unsigned octets = getLongFormOctets();
     check(octets >= 1 && octets <= 8, "valid long form");
     check(fitsIn(length, octets), "enough subsequent octets");
-    putNumber(*stream_, currentForm_, 1);
-    putNumber(*stream_, length, octets);
+    // The form octet and the length in one write.
+    char bytes[9];
+    bytes[0] = static_cast<char>(currentForm_);
+    for (unsigned i = 0; i < octets; ++i) bytes[1 + i] = static_cast<char>(length >> (8 * (octets - 1 - i)));
+    stream_->write(bytes, 1 + octets);
+    util::requireWritten(*stream_);
     return;
   }
   check(currentForm_ == shortForm, "valid current form");
