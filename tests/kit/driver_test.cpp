@@ -263,3 +263,17 @@ TEST(Driver, RawOfAnotherCodeOrWidthIsRefused) {
   EXPECT_EQ(assertionTextOf([&] { createZeltaDriver(sourceOf(m, 1))->start(createZeltaWriter(out)); }),
             refusal("supported display width"));
 }
+
+// The MPEG studio model of the older version with four channels takes 8,765
+// octets, more than the 9 * 1024 - 512 the layout plans: the header gets the
+// least multiple of 512 that holds it with a fill item, and the footer's
+// offset moves on with it.
+TEST(Driver, ModelLargerThanThePlannedRoomGetsTheLeastRoomThatHoldsIt) {
+  auto m = master(ZeltaEssenceFormat::MPEG, true, false, PictureKind::studio);
+  ASSERT_EQ(m->audioChannelCount, 4U);
+  const ReadRecord record = readBack(driven(sourceOf(m, 2)));
+  EXPECT_EQ(record.failure, "");
+  EXPECT_EQ(reportLines(record.errors.reports), std::vector<std::string>{});
+  EXPECT_EQ(record.structure.packs.front().headerByteCount, 9216U);
+  EXPECT_EQ(record.structure.packs.front().footerPartition, record.structure.packs.back().thisPartition);
+}
