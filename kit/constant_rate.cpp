@@ -4,12 +4,6 @@
 
 namespace zelta {
 
-namespace {
-
-constexpr std::uint64_t dvHeaderByteCount = d10HeaderByteCount;
-
-}  // namespace
-
 void ZeltaDriverImpl::startConstantRate() {
   gc_ = writer_->getGCStructureHandler();
   essence_ = writer_->getEssenceHandler();
@@ -77,7 +71,7 @@ void ZeltaDriverImpl::finishConstantRate() {
       break;
     default:
       footerKey = MXFPartitionPackKey(MXFFooterPartition, MXFClosedComplete);
-      pack_.headerByteCount = closed ? 0 : dvHeaderByteCount;
+      pack_.headerByteCount = closed ? 0 : d10DVHeaderByteCount;
       if (!closed) {
         pack_.indexByteCount = constantRateIndexByteCount;
         pack_.indexSID = segment_.indexSID;

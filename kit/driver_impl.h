@@ -100,7 +100,6 @@ class ZeltaDriverImpl : public ZeltaDriver {
   std::vector<MXFIndexTableSegment> segments_;
   AVCAccessUnitParser gopParser_;
   KLVKey bodyKey_;
-  bool bodyOpen_ = false;
   std::uint64_t partitionTarget_ = 0;
   std::uint64_t unitsInPartition_ = 0;
   std::uint32_t bodyIndexByteCount_ = 0;

@@ -146,8 +146,7 @@ std::uint64_t dataSize(const ZeltaMasterMetadata& master, ZeltaEssenceFormat for
 
 ElementSlot slot(const KLVKey& key, ElementSource source, ElementKind kind, std::uint64_t valueSize,
                  std::uint32_t channel = 0) {
-  ElementSlot element{key, source, kind, channel, valueSize, getPaddedSize(valueSize, shortLengthSize)};
-  return element;
+  return ElementSlot{key, source, kind, channel, getPaddedSize(valueSize, shortLengthSize)};
 }
 
 ElementSource pictureSource(ZeltaEssenceFormat format) {
@@ -215,11 +214,9 @@ std::vector<ElementSlot> getEditUnitLayout(const ZeltaMasterMetadata& master, Ze
     layout.push_back(slot(elementKey(elementPrefix, getPictureTrackNumber(format)), ElementSource::DVElement,
                           ElementKind::Compound, pictureSize(master, format)));
   } else if (format == ZeltaEssenceFormat::Raw) {
-    ElementSlot picture = slot(elementKey(rawElementPrefix, getPictureTrackNumber(format)), pictureSource(format),
-                               ElementKind::Picture, pictureSize(master, format));
-    picture.paddedSize = getPaddedSize(picture.valueSize, longLengthSize);
-    picture.lengthForm = longLengthForm;
-    layout.push_back(picture);
+    layout.push_back(ElementSlot{elementKey(rawElementPrefix, getPictureTrackNumber(format)), pictureSource(format),
+                                 ElementKind::Picture, 0, getPaddedSize(pictureSize(master, format), longLengthSize),
+                                 longLengthForm});
   } else {
     layout.push_back(slot(elementKey(elementPrefix, getPictureTrackNumber(format)), pictureSource(format),
                           ElementKind::Picture, pictureSize(master, format)));
@@ -254,7 +251,7 @@ std::uint64_t getConstantRateHeaderByteCount(const ZeltaMasterMetadata& master, 
     case ZeltaEssenceFormat::AVC:
       return avcHeaderByteCount;
     default:
-      return d10HeaderByteCount;
+      return d10DVHeaderByteCount;
   }
 }
 
@@ -263,7 +260,7 @@ std::uint64_t getVariableRateHeaderByteCount(const ZeltaMasterMetadata& master, 
   const std::uint64_t tracks = master.getAudioChannelCount() + dataFlag(master);
   const std::uint64_t room =
       ((tracks + 5) << 10) - (master.getPrefaceVersion() < newerModelVersion ? driverKagSize : 0);
-  return std::max(room, d10HeaderByteCount);
+  return std::max(room, d10DVHeaderByteCount);
 }
 
 }  // namespace zelta

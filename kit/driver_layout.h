@@ -17,7 +17,7 @@ inline constexpr std::uint64_t systemItemSize = driverKagSize;
 // The header partition of the constant rate path holds one index segment.
 inline constexpr std::uint64_t constantRateIndexByteCount = driverKagSize;
 inline constexpr std::uint64_t partitionPackLength = driverKagSize;
-inline constexpr std::uint64_t d10HeaderByteCount = 15872;
+inline constexpr std::uint64_t d10DVHeaderByteCount = 15872;
 inline constexpr std::uint64_t avcHeaderByteCount = 0x7FC00;
 inline constexpr std::uint64_t avcReservedHeaderSpace = 0x7FE00;
 inline constexpr std::uint64_t avcFooterIndexByteCount = 0x80000;
@@ -41,9 +41,8 @@ struct ElementSlot {
   ElementSource source;
   ElementKind kind;
   std::uint32_t channel = 0;
-  // The octets of value that the slot is sized for, and with key, length and
-  // fill the room it takes.
-  std::uint64_t valueSize = 0;
+  // Key, length, value and fill: the room of the largest value the slot
+  // takes.
   std::uint64_t paddedSize = 0;
   // The BER length form; KLVNoLengthForm leaves it to the coder.
   std::uint8_t lengthForm = KLVNoLengthForm;

@@ -58,18 +58,13 @@ void ZeltaDriverImpl::startVariableRate() {
     essence_ = mpegIndexer_.get();
   }
 
-  // Only AVC carries essence in the header partition, and no partition but
-  // the footer carries index.
-  const std::uint32_t bodySID = pack_.bodySID;
-  const std::uint32_t indexSID = pack_.indexSID;
-  pack_.bodySID = format_ == ZeltaEssenceFormat::AVC ? bodySID : 0;
+  // The header partition carries essence for AVC alone, and never index;
+  // the body partitions take their SIDs from the segment.
+  if (format_ != ZeltaEssenceFormat::AVC) pack_.bodySID = 0;
   pack_.indexSID = 0;
   startHeader(getVariableRateHeaderByteCount(*master_, format_), 0);
-  pack_.bodySID = bodySID;
-  pack_.indexSID = indexSID;
   if (format_ != ZeltaEssenceFormat::AVC) startBodyPartition(nullptr);
   gc_->start(driverKagSize);
-  bodyOpen_ = true;
 }
 
 void ZeltaDriverImpl::startBodyPartition(const MXFIndexTableSegment* index) {
@@ -138,11 +133,8 @@ void ZeltaDriverImpl::writeVariableRateEditUnit() {
 
 void ZeltaDriverImpl::finishVariableRate() {
   MXFStructureHandler* structure = writer_->getStructureHandler();
-  if (bodyOpen_) {
-    gc_->end();
-    if (format_ != ZeltaEssenceFormat::AVC) structure->endPartition(bodyKey_);
-    bodyOpen_ = false;
-  }
+  gc_->end();
+  if (format_ != ZeltaEssenceFormat::AVC) structure->endPartition(bodyKey_);
   if (avcIndexer_) avcIndexer_->flushIndex();
   segments_.push_back(segment_);
 

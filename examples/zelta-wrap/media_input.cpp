@@ -1,16 +1,32 @@
 #include "media_input.h"
 
+#include <cerrno>
+#include <cstring>
+
 #include "options.h"
 
 namespace zelta_wrap {
 
+namespace {
+
+// "cannot read PATH: why", in FFmpeg's words.
+InputError unreadable(const std::string& path, int error) {
+  char why[AV_ERROR_MAX_STRING_SIZE] = {};
+  av_strerror(error, why, sizeof why);
+  return InputError("cannot read " + path + ": " + why);
+}
+
+}  // namespace
+
 MediaFile::MediaFile(const std::string& path, AVMediaType kind) : path_(path) {
-  if (avformat_open_input(&format_, path.c_str(), nullptr, nullptr) < 0) throw InputError("cannot read " + path);
+  const int opened = avformat_open_input(&format_, path.c_str(), nullptr, nullptr);
+  if (opened < 0) throw unreadable(path, opened);
   packet_ = av_packet_alloc();
-  if (packet_ == nullptr || avformat_find_stream_info(format_, nullptr) < 0) {
+  const int found = packet_ == nullptr ? AVERROR(ENOMEM) : avformat_find_stream_info(format_, nullptr);
+  if (found < 0) {
     av_packet_free(&packet_);
     avformat_close_input(&format_);
-    throw InputError("cannot read " + path);
+    throw unreadable(path, found);
   }
   stream_ = av_find_best_stream(format_, kind, -1, -1, nullptr, 0);
   if (stream_ < 0) {
@@ -30,7 +46,7 @@ bool MediaFile::readPacket() {
     av_packet_unref(packet_);
     const int result = av_read_frame(format_, packet_);
     if (result == AVERROR_EOF) return false;
-    if (result < 0) throw InputError("cannot read " + path_);
+    if (result < 0) throw unreadable(path_, result);
     if (packet_->stream_index == stream_) return true;
   }
 }
@@ -41,7 +57,7 @@ PictureInput::PictureInput(const std::string& path, std::size_t chunkSize) : pat
     return;
   }
   raw_.open(path, std::ios::binary);
-  if (!raw_) throw InputError("cannot read " + path);
+  if (!raw_) throw InputError("cannot read " + path + ": " + std::strerror(errno));
 }
 
 bool PictureInput::next(std::vector<std::uint8_t>& frame) {

@@ -10,6 +10,7 @@
 #include "essence/mpeg_indexer.h"
 #include "support/essence_recording.h"
 #include "support/klv_output.h"
+#include "support/mpeg2_frames.h"
 #include "support/mxf_streams.h"
 #include "support/recording.h"
 
@@ -22,53 +23,6 @@ typedef MPEGIndexer::Picture Picture;
 
 // ---------------------------------------------------------------------------
 // Frames
-
-ByteVector startCode(std::uint8_t code) { return ByteVector{0x00, 0x00, 0x01, code}; }
-
-void append(ByteVector& to, const ByteVector& more) { to.insert(to.end(), more.begin(), more.end()); }
-
-// 1920x1080, aspect 16:9, 25 Hz, no matrices.
-ByteVector sequenceHeader() {
-  ByteVector bytes = startCode(0xB3);
-  append(bytes, bytesOf("78 04 38 35 FF FF E0 18"));
-  return bytes;
-}
-
-// Time code 10:00:00:00 in 25 bits, then closed_gop and broken_link.
-ByteVector gopHeader(bool closed, bool brokenLink) {
-  ByteVector bytes = startCode(0xB8);
-  append(bytes, bytesOf("50 08 00"));
-  bytes.push_back(static_cast<std::uint8_t>((closed ? 0x40 : 0) | (brokenLink ? 0x20 : 0)));
-  return bytes;
-}
-
-// temporal_reference in 10 bits, picture_coding_type in 3, vbv_delay.
-ByteVector pictureHeader(std::uint16_t temporalReference, std::uint8_t type) {
-  ByteVector bytes = startCode(0x00);
-  bytes.push_back(static_cast<std::uint8_t>(temporalReference >> 2));
-  bytes.push_back(static_cast<std::uint8_t>(((temporalReference & 0x03) << 6) | (type << 3) | 0x07));
-  append(bytes, bytesOf("FF F8"));
-  return bytes;
-}
-
-// A slice of arbitrary octets, with a zero run and start-code-like octets
-// behind the picture header that must not be looked at.
-ByteVector sliceData() {
-  ByteVector bytes = startCode(0x01);
-  append(bytes, bytesOf("12 34 00 00 01 B8 00 00 00 40 00 00 01 B3 56"));
-  return bytes;
-}
-
-enum Gop { noGop, openGop, closedGop };
-
-ByteVector frame(bool withSequenceHeader, Gop gop, std::uint16_t temporalReference, std::uint8_t type) {
-  ByteVector bytes;
-  if (withSequenceHeader) append(bytes, sequenceHeader());
-  if (gop != noGop) append(bytes, gopHeader(gop == closedGop, false));
-  append(bytes, pictureHeader(temporalReference, type));
-  append(bytes, sliceData());
-  return bytes;
-}
 
 Picture scan(const ByteVector& bytes) { return zelta::scanMPEG2Picture(bytes.data(), bytes.size()); }
 

@@ -112,6 +112,13 @@ class ZeltaWrapInterop : public WrapTest {
               md5Of("ffmpeg -nostdin -v error -i " + path(wav) + " -f " + format + " -"));
   }
 
+  // 720 lines at 50 frames in GOPs of fifteen, thirty frames.
+  void makeLongGOPAVC() {
+    ffmpeg(
+        "-f lavfi -i testsrc=size=1280x720:rate=50 -t 0.6 -c:v libx264 -pix_fmt yuv422p10le -g 15 -bf 2 -f h264 "
+        "avc.h264");
+  }
+
   void makeD10(const std::string& duration) {
     ffmpeg("-f lavfi -i testsrc=size=720x608:rate=25 -t " + duration +
            " -c:v mpeg2video -pix_fmt yuv422p -g 1 -bf 0 -flags +ildct+ilme -top 1 -b:v 50M -minrate 50M -maxrate 50M "
@@ -209,9 +216,7 @@ TEST_F(ZeltaWrapInterop, SoundThatEndsEarlyGoesOnInSilenceAndLongerSoundIsCut) {
 }
 
 TEST_F(ZeltaWrapInterop, AVCVariableWrapping) {
-  ffmpeg(
-      "-f lavfi -i testsrc=size=1280x720:rate=50 -t 0.6 -c:v libx264 -pix_fmt yuv422p10le -g 15 -bf 2 -f h264 "
-      "avc.h264");
+  makeLongGOPAVC();
   makeTone("tone.wav", 1000, "0.6", "pcm_s24le");
   wrap("--format AVC " + path("avc.h264") + " " + path("tone.wav"));
   expectPicture("avc.h264", {"h264", "1280", "720", "50/1", "30"});
@@ -336,9 +341,7 @@ TEST_F(ZeltaWrapInterop, AVCIntra100Of1080InterlacedLinesAtConstantSize) {
 }
 
 TEST_F(ZeltaWrapInterop, AVCLongGOPWithUnknownDurationAtStart) {
-  ffmpeg(
-      "-f lavfi -i testsrc=size=1280x720:rate=50 -t 0.6 -c:v libx264 -pix_fmt yuv422p10le -g 15 -bf 2 -f h264 "
-      "avc.h264");
+  makeLongGOPAVC();
   wrap("--format AVC --unknown-duration " + path("avc.h264"), {openHeader});
   expectPicture("avc.h264", {"h264", "1280", "720", "50/1", "30"});
   EXPECT_EQ(probe(path("out.mxf"), "", "format=duration"), "0.600000");

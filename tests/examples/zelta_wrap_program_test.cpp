@@ -116,7 +116,7 @@ TEST_F(ZeltaWrapRefusal, ClipThatTheKitCannotDescribe) {
 }
 
 TEST_F(ZeltaWrapRefusal, PictureThatCannotBeRead) {
-  expectRefused("--format DV -o " + path("out.mxf") + " " + path("absent.dv"), "cannot read " + path("absent.dv"));
+  expectRefused("--format DV -o " + path("out.mxf") + " " + path("absent.dv"), "cannot read " + path("absent.dv") + ": No such file or directory");
 }
 
 TEST_F(ZeltaWrapRefusal, ExistingOutputStaysWhenRefused) {

@@ -76,8 +76,15 @@ TEST(DriverVariableRate, BodyPartitionsBeginAtTheGOPBeforeTenSecondsAndCarryTheI
     EXPECT_EQ(record.index.segments[1].indexDuration, 240);
     EXPECT_EQ(record.index.segments[2].indexStartPosition, 480);
     EXPECT_EQ(record.index.segments[2].indexDuration, 120);
-    // Body offsets count the essence before each partition.
-    EXPECT_EQ(packs[2].bodyOffset, record.index.segments[1].indexEntryArray.front().streamOffset);
+    // Each edit unit takes 27136 octets: the system item's 512, the picture's
+    // 20 + 2000 filled to 2048, and in the second slice four channels of
+    // 6144. Body offsets count the essence before each partition, as the
+    // entries do.
+    EXPECT_EQ(packs[2].bodyOffset, 240U * 27136U);
+    EXPECT_EQ(packs[3].bodyOffset, 480U * 27136U);
+    EXPECT_EQ(record.index.segments[1].indexEntryArray.front().streamOffset, 240U * 27136U);
+    EXPECT_EQ(record.index.segments[0].indexEntryArray.at(1).streamOffset, 27136U);
+    EXPECT_EQ(record.index.segments[0].indexEntryArray.at(1).sliceOffsets, std::vector<std::uint32_t>{2560});
     ASSERT_EQ(record.gc.elements.size(), unitCount * elementsPerUnit);
   }
 }

@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "support/mpeg2_frames.h"
+
 namespace zelta_test {
 
 ByteVector patternOf(std::uint64_t unit, std::uint32_t element, std::size_t size) {
@@ -11,14 +13,8 @@ ByteVector patternOf(std::uint64_t unit, std::uint32_t element, std::size_t size
 }
 
 ByteVector mpeg2Frame(std::uint16_t temporalReference, std::uint8_t codingType, bool closedGOP, std::size_t size) {
-  ByteVector bytes;
-  if (codingType == 1) {
-    bytes.insert(bytes.end(), {0x00, 0x00, 0x01, 0xB3, 0x78, 0x04, 0x38, 0x35, 0xFF, 0xFF, 0xE0, 0x18});
-    bytes.insert(bytes.end(),
-                 {0x00, 0x00, 0x01, 0xB8, 0x00, 0x08, 0x00, static_cast<std::uint8_t>(closedGOP ? 0x40 : 0x00)});
-  }
-  bytes.insert(bytes.end(), {0x00, 0x00, 0x01, 0x00, static_cast<std::uint8_t>(temporalReference >> 2),
-                             static_cast<std::uint8_t>(((temporalReference & 3) << 6) | (codingType << 3))});
+  const bool intra = codingType == 1;
+  ByteVector bytes = frame(intra, intra ? (closedGOP ? closedGop : openGop) : noGop, temporalReference, codingType);
   if (bytes.size() < size) bytes.resize(size, 0xAA);
   return bytes;
 }
